@@ -1,0 +1,40 @@
+#include "engine/diagnostics.h"
+
+#include "model/codec.h"
+
+Q_LOGGING_CATEGORY(lcSerial, "kv700.serial", QtWarningMsg)
+Q_LOGGING_CATEGORY(lcEngine, "kv700.engine", QtWarningMsg)
+Q_LOGGING_CATEGORY(lcModel, "kv700.model", QtWarningMsg)
+Q_LOGGING_CATEGORY(lcFiles, "kv700.files", QtWarningMsg)
+Q_LOGGING_CATEGORY(lcDrivers, "kv700.drivers", QtWarningMsg)
+
+namespace kv {
+
+namespace {
+DiagnosticSink* installedSink = nullptr;
+
+const QLoggingCategory& categoryOf(int level) {
+    return level == DiagSerialStep ? lcSerial() : lcEngine();
+}
+} // namespace
+
+DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink) {
+    DiagnosticSink* previous = installedSink;
+    installedSink = sink;
+    return previous;
+}
+
+void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
+                  const QString& kind) {
+    qCDebug(categoryOf(level)).noquote() << level << tag << kind << text << StrToHex(data);
+    if (installedSink)
+        installedSink->debugMessage(level, tag, text, data, kind);
+}
+
+void AddMessage(const QString& text) {
+    qCDebug(lcEngine).noquote() << text;
+    if (installedSink)
+        installedSink->addMessage(text);
+}
+
+} // namespace kv

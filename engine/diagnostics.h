@@ -1,0 +1,37 @@
+#pragma once
+// The program-wide diagnostic channel. Every subsystem reports through
+// DebugMessage/AddMessage; the main window (or a test) installs the sink that
+// turns them into log lines and status texts. Without a sink the lines go to
+// Qt's logging categories only.
+
+#include <QByteArray>
+#include <QLoggingCategory>
+#include <QString>
+
+Q_DECLARE_LOGGING_CATEGORY(lcSerial)
+Q_DECLARE_LOGGING_CATEGORY(lcEngine)
+Q_DECLARE_LOGGING_CATEGORY(lcModel)
+Q_DECLARE_LOGGING_CATEGORY(lcFiles)
+Q_DECLARE_LOGGING_CATEGORY(lcDrivers)
+
+namespace kv {
+
+// Levels of the diagnostic log.
+enum DiagLevel { DiagSend = 0, DiagReceive = 1, DiagGeneral = 2, DiagSerialStep = 3 };
+
+class DiagnosticSink {
+public:
+    virtual ~DiagnosticSink() = default;
+    virtual void debugMessage(int level, const QString& tag, const QString& text,
+                              const QByteArray& data, const QString& kind) = 0;
+    virtual void addMessage(const QString& text) = 0;
+};
+
+// Installs the sink (nullptr removes it); returns the previous one.
+DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink);
+
+void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data = {},
+                  const QString& kind = {});
+void AddMessage(const QString& text);
+
+} // namespace kv
