@@ -16,7 +16,7 @@ DiagnosticSink* installedSink = nullptr;
 const QLoggingCategory& categoryOf(int level) {
     return level == DiagSerialStep ? lcSerial() : lcEngine();
 }
-} // namespace
+}  // namespace
 
 DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink) {
     DiagnosticSink* previous = installedSink;
@@ -27,14 +27,12 @@ DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink) {
 void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
                   const QString& kind) {
     qCDebug(categoryOf(level)).noquote() << level << tag << kind << text << StrToHex(data);
-    if (installedSink)
-        installedSink->debugMessage(level, tag, text, data, kind);
+    if (installedSink) installedSink->debugMessage(level, tag, text, data, kind);
 }
 
 void AddMessage(const QString& text) {
     qCDebug(lcEngine).noquote() << text;
-    if (installedSink)
-        installedSink->addMessage(text);
+    if (installedSink) installedSink->addMessage(text);
 }
 
-} // namespace kv
+}  // namespace kv

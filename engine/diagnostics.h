@@ -34,4 +34,4 @@ void DebugMessage(int level, const QString& tag, const QString& text, const QByt
                   const QString& kind = {});
 void AddMessage(const QString& text);
 
-} // namespace kv
+}  // namespace kv

@@ -7,4 +7,4 @@ RangeTable& ProgramRangeTable(int channel) {
     return tables[channel >= Input1 && channel <= Output2 ? channel - 1 : 0];
 }
 
-} // namespace kv
+}  // namespace kv

@@ -24,4 +24,4 @@ enum RangeChannel { Input1 = 1, Output1 = 2, Input2 = 3, Output2 = 4 };
 // The program-wide table of a channel (1..4); any other channel yields Input 1's.
 RangeTable& ProgramRangeTable(int channel);
 
-} // namespace kv
+}  // namespace kv

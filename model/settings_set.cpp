@@ -11,4 +11,4 @@ SettingsSet& RestoredSet() {
     return restored;
 }
 
-} // namespace kv
+}  // namespace kv

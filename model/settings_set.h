@@ -64,4 +64,4 @@ struct SettingsSet {
 // The record most recently loaded from a file.
 SettingsSet& RestoredSet();
 
-} // namespace kv
+}  // namespace kv

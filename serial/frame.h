@@ -1,0 +1,26 @@
+#pragma once
+// Framing of the 12-character messages and the search for the echoing reply.
+//
+// Frame: STX, message, ETX, two check characters (0xFF XOR message and ETX,
+// as two nibble characters). A reply is accepted only when it echoes the sent
+// frame's STX, command, bus ID and address, ends in ETX and checks correctly.
+
+#include <QByteArray>
+
+namespace kv::KvSerialPort {
+
+constexpr char STX = 0x02;
+constexpr char ETX = 0x03;
+constexpr int MessageLength = 12;
+constexpr int FrameLength = 16;
+
+// The 16-byte frame of a 12-character message, sent as given.
+QByteArray BuildFrame(const QByteArray& message);
+
+// Scans `accumulator` for the reply to `sent`. On success returns true with the
+// 12-character reply message. Otherwise keeps an incomplete candidate at the
+// front of the accumulator (the next read appends to it) or empties it.
+// `debug` logs "Check Sum Failed" for a candidate with wrong check characters.
+bool ScanReply(QByteArray& accumulator, const QByteArray& sent, QByteArray& reply, bool debug);
+
+}  // namespace kv::KvSerialPort
