@@ -12,6 +12,7 @@ namespace kv {
 
 namespace {
 DiagnosticSink* installedSink = nullptr;
+bool debugFlag = false;
 
 const QLoggingCategory& categoryOf(int level) {
     return level == DiagSerialStep ? lcSerial() : lcEngine();
@@ -27,12 +28,32 @@ DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink) {
 void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
                   const QString& kind) {
     qCDebug(categoryOf(level)).noquote() << level << tag << kind << text << StrToHex(data);
-    if (installedSink) installedSink->debugMessage(level, tag, text, data, kind);
+    if (installedSink)
+        installedSink->debugMessage(level, tag, text, data, kind);
 }
 
 void AddMessage(const QString& text) {
     qCDebug(lcEngine).noquote() << text;
-    if (installedSink) installedSink->addMessage(text);
+    if (installedSink)
+        installedSink->addMessage(text);
+}
+
+void ShowStatus(const QString& text) {
+    qCDebug(lcEngine).noquote() << "status:" << text;
+    if (installedSink)
+        installedSink->showStatus(text);
+}
+
+void FailGeneral(const QString& procedure, const QString& tag, const QString& description) {
+    Q_UNUSED(tag);
+    ShowStatus(procedure + QStringLiteral(": ") + description);
+}
+
+bool DebugFlag() {
+    return debugFlag;
+}
+void SetDebugFlag(bool on) {
+    debugFlag = on;
 }
 
 }  // namespace kv
