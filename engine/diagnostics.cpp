@@ -13,6 +13,7 @@ namespace kv {
 namespace {
 DiagnosticSink* installedSink = nullptr;
 bool debugFlag = false;
+QString statusText;
 
 const QLoggingCategory& categoryOf(int level) {
     return level == DiagSerialStep ? lcSerial() : lcEngine();
@@ -30,6 +31,8 @@ void DebugMessage(int level, const QString& tag, const QString& text, const QByt
     qCDebug(categoryOf(level)).noquote() << level << tag << kind << text << StrToHex(data);
     if (installedSink)
         installedSink->debugMessage(level, tag, text, data, kind);
+    if (level == DiagGeneral)
+        ShowStatus(tag + QLatin1Char(':') + text + StrToHex(data));
 }
 
 void AddMessage(const QString& text) {
@@ -40,6 +43,7 @@ void AddMessage(const QString& text) {
 
 void ShowStatus(const QString& text) {
     qCDebug(lcEngine).noquote() << "status:" << text;
+    statusText = text;
     if (installedSink)
         installedSink->showStatus(text);
 }
@@ -48,6 +52,8 @@ void FailGeneral(const QString& procedure, const QString& tag, const QString& de
     Q_UNUSED(tag);
     ShowStatus(procedure + QStringLiteral(": ") + description);
 }
+
+QString StatusText() { return statusText; }
 
 bool DebugFlag() {
     return debugFlag;

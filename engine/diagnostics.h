@@ -32,10 +32,13 @@ public:
 // Installs the sink (nullptr removes it); returns the previous one.
 DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink);
 
+// A level-2 line also goes to the status line as tag, ":", text and data.
 void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data = {},
                   const QString& kind = {});
 void AddMessage(const QString& text);
 void ShowStatus(const QString& text);
+// The text last put on the status line.
+QString StatusText();
 // The procedure's name, ": " and the description on the status line.
 void FailGeneral(const QString& procedure, const QString& tag, const QString& description);
 
