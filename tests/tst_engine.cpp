@@ -190,7 +190,7 @@ void TestEngine::writeDataFields_data() {
     QTest::addColumn<qint16>("type");
     QTest::addColumn<QVariantList>("values");
     QTest::addColumn<QByteArray>("data");
-    QTest::newRow("long") << qint16(ValueLong) << QVariantList{-2, 0, 0, 0} << QByteArray("???????>");
+    QTest::newRow("long") << qint16(ValueLong) << QVariantList{-2, 0, 0, 0} << QByteArray("??????" "?>");
     QTest::newRow("long rounds half to even") << qint16(ValueLongToo) << QVariantList{2.5, 0, 0, 0}
                                               << QByteArray("00000002");
     QTest::newRow("single") << qint16(ValueSingle) << QVariantList{1.0, 0, 0, 0} << QByteArray("3?800000");
