@@ -21,14 +21,16 @@ bool Fail(QString& message, const QString& text) {
     return false;
 }
 
-QString Temperature(double celsius, const QString& unit, bool span) {
-    double value = 0.0;
-    QString ignored;
-    if (span)
-        DegC_SpanToDegEng(value, unit, celsius, ignored);
-    else
-        DegC_ToDegEng(value, unit, celsius, ignored);
+QString Shown(double value, const QString& unit) {
     return QString::number(value) + QLatin1Char(' ') + unit;
+}
+
+// "FAIL TYPE K maximum is:1372 degC", the limit shown in the user's unit.
+bool LimitFailure(QString& message, const QString& sensorText, const QString& which, double limit,
+                  const QString& unit) {
+    double shown = 0.0;
+    DegC_ToDegEng(shown, unit, limit, message);
+    return Fail(message, QStringLiteral("FAIL ") + sensorText + which + Shown(shown, unit));
 }
 
 }  // namespace
@@ -57,20 +59,20 @@ bool BuildSensorTable(Table1Data& table, double& inputZero, double& inputFull, d
     if (!DegEngToDegC(engZero, engUnit, zero, message)) return false;
     if (!DegEngToDegC(engFull, engUnit, full, message)) return false;
     const double span = full - zero;
-    if (span < MinimumSpan - LimitTolerance)
-        return Fail(message, QStringLiteral("FAIL minimum span is ") +
-                                 Temperature(MinimumSpan, engUnit, true));
+    if (span < MinimumSpan - LimitTolerance) {
+        double shown = 0.0;
+        DegC_SpanToDegEng(shown, engUnit, MinimumSpan, message);
+        return Fail(message, QStringLiteral("FAIL minimum span is ") + Shown(shown, engUnit));
+    }
 
     double minimum = 0.0;
     double maximum = 0.0;
     const double valueZero = SensorValue(sensor, zero, minimum, maximum, message);
     if (valueZero == SensorFailValue) return false;
     if (zero < minimum - LimitTolerance)
-        return Fail(message, QStringLiteral("FAIL ") + sensorText + QStringLiteral(" minimum is:") +
-                                 Temperature(minimum, engUnit, false));
+        return LimitFailure(message, sensorText, QStringLiteral(" minimum is:"), minimum, engUnit);
     if (full > maximum + LimitTolerance)
-        return Fail(message, QStringLiteral("FAIL ") + sensorText + QStringLiteral(" maximum is:") +
-                                 Temperature(maximum, engUnit, false));
+        return LimitFailure(message, sensorText, QStringLiteral(" maximum is:"), maximum, engUnit);
     const double valueFull = SensorValue(sensor, full, minimum, maximum, message);
 
     Table1Data built = table;
