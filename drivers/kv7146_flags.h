@@ -1,0 +1,17 @@
+#pragma once
+// The flag word of the second-version KV714 and KV716: response time, shape and
+// the output choices. The KV716 keeps a choice per output (bit 0 of the record
+// field for output 1, bit 1 for output 2); the KV714 one choice each.
+
+#include "model/settings_set.h"
+
+namespace kv {
+
+// Model numbers the KV714/KV716 drivers serve; also the family CheckModType confirms.
+enum KV7146Model { KV714v1 = 1, KV716v1 = 2, KV714v2 = 4, KV716v2 = 5 };
+
+quint16 KV7146v2FlagA(const SettingsSet& settings, int model);
+// Response, shape and output choices back from a flag word.
+void KV7146v2ReadFlagA(quint16 flags, int model, SettingsSet& settings);
+
+}  // namespace kv
