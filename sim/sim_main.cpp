@@ -54,13 +54,15 @@ int main(int argc, char* argv[]) {
         << ", adapter type " << command.options.adapter << "\n";
     out.flush();
 
-    std::size_t shown = 0;
+    qint64 shown = 0;
     const timespec poll{0, 200 * 1000 * 1000};
     while (sigtimedwait(&stopSignals, nullptr, &poll) < 0) {
         if (!command.logFrames) continue;
-        const std::vector<SimLogEntry> log = simulator.log();
-        for (; shown < log.size(); ++shown)
-            out << DescribeLogEntry(log[shown]) << "\n";
+        for (const SimLogEntry& entry : simulator.log()) {
+            if (entry.sequence < shown) continue;
+            out << DescribeLogEntry(entry) << "\n";
+            shown = entry.sequence + 1;
+        }
         out.flush();
     }
     simulator.stop();

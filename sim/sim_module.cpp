@@ -9,6 +9,11 @@ namespace {
 // The address every module answers its type code at, whatever its family.
 const int universalTypeAddress = RegMap().Mod_Type;
 
+// Every multi-part register numbers its parts from the same bus ID.
+constexpr int FirstPart = Table1Ids.first;
+static_assert(FirstPart == TableCIds.first && FirstPart == FileNameIds.first &&
+              FirstPart == CalErrorIds.first);
+
 constexpr qint32 FullScale = 10000;    // Input_Reading: 0.01 % of the calibrated span
 constexpr double ReadingPeriodS = 60;  // one sweep up and down through the range
 constexpr double SweepMargin = 0.02;   // the sweep runs this far past both ends
@@ -173,7 +178,7 @@ qint32 SimModule::liveValue(int address) const {
 qint32 SimModule::value(int address) const {
     if (address < 0 || address >= RegisterCount) return 0;
     const Part part = partAt(address);
-    if (part != Part::None) return qint32(nibbles(readPart(part, FileNameIds.first).data));
+    if (part != Part::None) return qint32(nibbles(readPart(part, FirstPart).data));
     if (isLive(address)) return liveValue(address);
     return image_.registers[address];
 }
@@ -210,7 +215,7 @@ SimModule::Answer SimModule::handle(const Request& request) {
 
 SimModule::Answer SimModule::readPart(Part part, int busId) const {
     Answer answer;
-    const int k = busId - FileNameIds.first;  // every multi-part register starts at 16
+    const int k = busId - FirstPart;
     switch (part) {
     case Part::FileName:
         if (isPart(FileNameIds, busId)) answer.data = byteText(image_.fileName.mid(k, 4));
@@ -241,7 +246,7 @@ SimModule::Answer SimModule::readPart(Part part, int busId) const {
 }
 
 SimModule::Answer SimModule::writePart(Part part, int busId, const QByteArray& data) {
-    const int k = busId - FileNameIds.first;
+    const int k = busId - FirstPart;
     switch (part) {
     case Part::FileName:
         if (!isPart(FileNameIds, busId)) break;

@@ -29,6 +29,10 @@ constexpr int PrimingToRelease = 16;
 // program's 10 ms gap between bytes, so its reads never come back empty.
 constexpr int TailBytes = 2;
 constexpr int TailStepMs = 5;
+// A demonstration runs for hours; the log keeps the recent past.
+constexpr std::size_t LogLimit = 10000;
+constexpr std::size_t LogDrop = 1000;
+
 // Added to the wake-up counter to end the thread; ordinary wake-ups add 1.
 constexpr quint64 StopMark = 1ull << 40;
 
@@ -46,6 +50,7 @@ struct Simulator::State {
     SimFaults faults;
     int faultFrames = 0;
     std::vector<SimLogEntry> log;
+    qint64 logged = 0;
     int frames = 0;
     int ignored = 0;
     int priming = 0;
@@ -74,6 +79,7 @@ struct Simulator::State {
     void run();
     void handleEvents(const std::vector<FrameScanner::Event>& events);
     void handleFrame(const Request& request);
+    void append(SimLogEntry entry);
     void noteIgnored(const QByteArray& bytes);
     void notePriming(int count);
     void schedule(QByteArray reply);
@@ -104,6 +110,7 @@ bool Simulator::start(QString& error) {
         return false;
     }
     d->started = Clock::now();
+    d->scanner = FrameScanner();
     d->thread = std::thread([this] { d->run(); });
     return true;
 }
@@ -320,8 +327,14 @@ void Simulator::State::noteIgnored(const QByteArray& bytes) {
     }
     SimLogEntry entry;
     entry.kind = SimLogEntry::Ignored;
-    entry.msec = msecNow();
     entry.bytes = bytes;
+    append(entry);
+}
+
+void Simulator::State::append(SimLogEntry entry) {
+    if (log.size() >= LogLimit) log.erase(log.begin(), log.begin() + LogDrop);
+    entry.sequence = logged++;
+    entry.msec = msecNow();
     log.push_back(entry);
 }
 
@@ -346,7 +359,6 @@ void Simulator::State::handleFrame(const Request& request) {
 
     SimLogEntry entry;
     entry.kind = SimLogEntry::Request;
-    entry.msec = msecNow();
     entry.command = request.command;
     entry.busId = request.busId;
     entry.address = request.address;
@@ -354,14 +366,14 @@ void Simulator::State::handleFrame(const Request& request) {
 
     if (faults.deadAfter >= 0 && number > faults.deadAfter) {
         entry.outcome = SimLogEntry::Dead;
-        log.push_back(entry);
+        append(entry);
         return;
     }
     const SimModule::Answer answer = module->handle(request);
     const bool dropped = (faults.dropEvery > 0 && number % faults.dropEvery == 0) ||
                          (faults.dropFrame > 0 && number == faults.dropFrame);
     entry.outcome = dropped ? SimLogEntry::Dropped : SimLogEntry::Answered;
-    log.push_back(entry);
+    append(entry);
     if (faults.swapAfter >= 0 && number == faults.swapAfter)
         module = module->replacedBy(faults.swapTo);
     if (dropped) return;

@@ -30,7 +30,8 @@ struct SimLogEntry {
     enum Kind { Request, Ignored };
     enum Outcome { Answered, Dropped, Dead };
     Kind kind = Request;
-    qint64 msec = 0;  // since the simulator started
+    qint64 sequence = 0;  // running number, kept when old entries leave a full log
+    qint64 msec = 0;      // since the simulator started
     // Request: the frame as decoded, and what became of its reply.
     char command = 0;
     int busId = 0;
@@ -59,6 +60,7 @@ public:
     bool publishAsPort(int port, QString& error);
     QString portLinkPath() const;
 
+    // The most recent entries (up to 10000; older ones are dropped in blocks).
     std::vector<SimLogEntry> log() const;
     int frameCount() const;    // valid request frames received
     int ignoredBytes() const;  // bytes that formed no valid frame
