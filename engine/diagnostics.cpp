@@ -12,6 +12,8 @@ namespace kv {
 
 namespace {
 DiagnosticSink* installedSink = nullptr;
+bool debugFlag = false;
+QString statusText;
 
 const QLoggingCategory& categoryOf(int level) {
     return level == DiagSerialStep ? lcSerial() : lcEngine();
@@ -27,12 +29,37 @@ DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink) {
 void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
                   const QString& kind) {
     qCDebug(categoryOf(level)).noquote() << level << tag << kind << text << StrToHex(data);
-    if (installedSink) installedSink->debugMessage(level, tag, text, data, kind);
+    if (installedSink)
+        installedSink->debugMessage(level, tag, text, data, kind);
+    if (level == DiagGeneral)
+        ShowStatus(tag + QLatin1Char(':') + text + StrToHex(data));
 }
 
 void AddMessage(const QString& text) {
     qCDebug(lcEngine).noquote() << text;
-    if (installedSink) installedSink->addMessage(text);
+    if (installedSink)
+        installedSink->addMessage(text);
+}
+
+void ShowStatus(const QString& text) {
+    qCDebug(lcEngine).noquote() << "status:" << text;
+    statusText = text;
+    if (installedSink)
+        installedSink->showStatus(text);
+}
+
+void FailGeneral(const QString& procedure, const QString& tag, const QString& description) {
+    Q_UNUSED(tag);
+    ShowStatus(procedure + QStringLiteral(": ") + description);
+}
+
+QString StatusText() { return statusText; }
+
+bool DebugFlag() {
+    return debugFlag;
+}
+void SetDebugFlag(bool on) {
+    debugFlag = on;
 }
 
 }  // namespace kv

@@ -25,13 +25,25 @@ public:
     virtual void debugMessage(int level, const QString& tag, const QString& text,
                               const QByteArray& data, const QString& kind) = 0;
     virtual void addMessage(const QString& text) = 0;
+    // The status line of the main window; a sink without one ignores it.
+    virtual void showStatus(const QString& text) { Q_UNUSED(text); }
 };
 
 // Installs the sink (nullptr removes it); returns the previous one.
 DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink);
 
+// A level-2 line also goes to the status line as tag, ":", text and data.
 void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data = {},
                   const QString& kind = {});
 void AddMessage(const QString& text);
+void ShowStatus(const QString& text);
+// The text last put on the status line.
+QString StatusText();
+// The procedure's name, ": " and the description on the status line.
+void FailGeneral(const QString& procedure, const QString& tag, const QString& description);
+
+// Set at start from the command line; without it nothing reaches the message log.
+bool DebugFlag();
+void SetDebugFlag(bool on);
 
 }  // namespace kv

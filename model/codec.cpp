@@ -23,7 +23,8 @@ qint32 WireToLong(const QByteArray& text) {
 
 bool WireToInt(const QByteArray& text, qint16& value) {
     const qint32 wide = WireToLong(text);
-    if (wide < -32768 || wide > 32767) return false;
+    if (wide < -32768 || wide > 32767)
+        return false;
     value = qint16(wide);
     return true;
 }
@@ -56,7 +57,8 @@ QString DecToBin(quint32 value, bool grouped) {
     QString text;
     for (int bit = 31; bit >= 0; --bit) {
         text += (value >> bit) & 1 ? QLatin1Char('1') : QLatin1Char('0');
-        if (grouped && bit % 8 == 0 && bit > 0) text += QLatin1Char(' ');
+        if (grouped && bit % 8 == 0 && bit > 0)
+            text += QLatin1Char(' ');
     }
     return text;
 }
@@ -80,7 +82,8 @@ QString ToBin(quint32 value) {
     QString text;
     for (int bit = digits - 1; bit >= 0; --bit) {
         text += (value >> bit) & 1 ? QLatin1Char('1') : QLatin1Char('0');
-        if (bit % 4 == 0 && bit > 0) text += QLatin1Char(' ');
+        if (bit % 4 == 0 && bit > 0)
+            text += QLatin1Char(' ');
     }
     return text;
 }
@@ -117,7 +120,8 @@ QString StrToHex(const QByteArray& text) {
 QString TextPart(const QString& text, const QString& separator, bool before) {
     const QString trimmed = text.trimmed();
     const int at = trimmed.indexOf(separator);
-    if (trimmed.isEmpty() || separator.isEmpty() || at < 0) return trimmed;
+    if (trimmed.isEmpty() || separator.isEmpty() || at < 0)
+        return trimmed;
     return before ? trimmed.left(at) : trimmed.mid(at + separator.size());
 }
 

@@ -193,9 +193,8 @@ void SetRegMap(RegMap& addresses, int map) {
         return;
     }
     if (map < 1 || map > MapCount) return;
-    const RegMap table = RegMapFor(map);
     for (const RegisterRow& row : AllRegisters())
-        row.field.setAddress(addresses, row.field.address(table));
+        row.field.setAddress(addresses, row.addressIn(map));
 }
 
 }  // namespace kv

@@ -138,6 +138,8 @@ public:
     constexpr const char* name() const { return name_; }
     constexpr RegWidth width() const { return width_; }
     constexpr bool is(qint32 RegMap::*member) const { return longMember_ == member; }
+    constexpr bool is(qint16 RegMap::*member) const { return intMember_ == member; }
+    constexpr bool is(float RegMap::*member) const { return singleMember_ == member; }
 
     // The member's value, exact for every width.
     double value(const RegMap& record) const;

@@ -60,7 +60,8 @@ bool judgeAdapter(PortHandle& handle, const QByteArray& frame, QString& text) {
         const qint64 elapsed = clock.elapsed();
         DebugMessage(DiagSerialStep, QStringLiteral("COM"), millis(elapsed, " +"), received,
                      QStringLiteral("Sc"));
-        if (count > 0) continue;
+        if (count > 0)
+            continue;
         if (elapsed > DecayMaxMs) {
             text = QStringLiteral("decay") + millis(elapsed, " > 200mS ");
             return false;

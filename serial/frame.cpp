@@ -21,7 +21,8 @@ bool ScanReply(QByteArray& accumulator, const QByteArray& sent, QByteArray& repl
     // address, then the ETX that closes the message.
     static constexpr int echoed[] = {1, 2, 3, 13};
     for (int i = 0; i < count; ++i) {
-        if (accumulator[i] != sent[0]) continue;
+        if (accumulator[i] != sent[0])
+            continue;
         bool mismatch = false;
         bool incomplete = false;
         for (int offset : echoed) {
@@ -34,12 +35,14 @@ bool ScanReply(QByteArray& accumulator, const QByteArray& sent, QByteArray& repl
                 break;
             }
         }
-        if (!mismatch && !incomplete && i + FrameLength - 1 >= count) incomplete = true;
+        if (!mismatch && !incomplete && i + FrameLength - 1 >= count)
+            incomplete = true;
         if (incomplete) {
             accumulator.remove(0, i);
             return false;
         }
-        if (mismatch) continue;
+        if (mismatch)
+            continue;
         const QByteArray message = accumulator.mid(i + 1, MessageLength);
         const QByteArray check = accumulator.mid(i + 14, 2);
         if (FrameChecksum(message + ETX) == check) {

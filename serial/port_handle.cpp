@@ -55,7 +55,8 @@ int remainingMs(const QElapsedTimer& clock, qint64 deadlineMs) {
 }  // namespace
 
 void PortHandle::close() {
-    if (fd_ < 0) return;
+    if (fd_ < 0)
+        return;
     ioctl(fd_, TIOCNXCL);
     flock(fd_, LOCK_UN);
     ::close(fd_);
@@ -114,7 +115,8 @@ bool PortHandle::writeBlock(const char* data, int size, int& written, int& error
             return false;
         }
         const int wait = remainingMs(clock, WriteTotalMs);
-        if (wait == 0) break;
+        if (wait == 0)
+            break;
         pollfd p{fd_, POLLOUT, 0};
         poll(&p, 1, wait);
     }
@@ -135,18 +137,23 @@ bool PortHandle::readBlock(char* data, int size, int& count, int& error) {
             error = errno;
             return false;
         }
-        if (ready == 0) break;  // time-out: whatever arrived is the result
-        if (ready < 0) continue;
+        if (ready == 0)
+            break;  // time-out: whatever arrived is the result
+        if (ready < 0)
+            continue;
         const ssize_t n = ::read(fd_, data + count, size_t(size - count));
         if (n < 0) {
-            if (errno == EINTR || (errno == EAGAIN && !(p.revents & (POLLHUP | POLLERR)))) continue;
-            if (errno == EAGAIN) break;
+            if (errno == EINTR || (errno == EAGAIN && !(p.revents & (POLLHUP | POLLERR))))
+                continue;
+            if (errno == EAGAIN)
+                break;
             error = errno;
             return false;
         }
         if (n == 0) {
             // Hang-up with nothing to read: nothing more will arrive in this read.
-            if (p.revents & POLLHUP) break;
+            if (p.revents & POLLHUP)
+                break;
             continue;
         }
         count += int(n);

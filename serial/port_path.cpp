@@ -20,16 +20,19 @@ constexpr BuiltInRange builtInPorts[] = {
 
 QString PortDirectory() {
     const QString own = qEnvironmentVariable("KV700_PORT_DIR");
-    if (!own.isEmpty()) return own;
+    if (!own.isEmpty())
+        return own;
     QString config = qEnvironmentVariable("XDG_CONFIG_HOME");
-    if (config.isEmpty()) config = QDir::homePath() + QStringLiteral("/.config");
+    if (config.isEmpty())
+        config = QDir::homePath() + QStringLiteral("/.config");
     return config + QStringLiteral("/kv700/ports");
 }
 
 QString PortDevicePath(qint16 port) {
     const QString link = PortDirectory() + QStringLiteral("/com%1").arg(port);
     const QFileInfo info(link);
-    if (info.isSymLink() || info.exists()) return link;
+    if (info.isSymLink() || info.exists())
+        return link;
     for (const BuiltInRange& range : builtInPorts) {
         if (port >= range.first && port <= range.last)
             return QString::fromLatin1(range.prefix) + QString::number(port - range.first);

@@ -91,9 +91,12 @@ bool Transact(qint16 port, const QByteArray& message, qint16 connector, bool deb
             return false;
         }
         accumulator.append(buffer, count);
-        if (debug) logStep(elapsedText(clock, " +"), accumulator);
-        if (ScanReply(accumulator, frame, reply, debug)) return true;
-        if (debug) logStep(elapsedText(clock, " F"), {});
+        if (debug)
+            logStep(elapsedText(clock, " +"), accumulator);
+        if (ScanReply(accumulator, frame, reply, debug))
+            return true;
+        if (debug)
+            logStep(elapsedText(clock, " F"), {});
         if (cycle == TableReadBudget) {
             logStep(elapsedText(clock, " Write Table Time Out"), {});
             reply = message;

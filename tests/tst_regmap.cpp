@@ -19,7 +19,6 @@ class TestRegMap : public QObject {
 private slots:
     void addressesOfMaps_data();
     void addressesOfMaps();
-    void floatingAddressesRound();
     void unknownMapsDefineNothing_data();
     void unknownMapsDefineNothing();
     void setRegMapAppliesAndResets();
@@ -40,24 +39,15 @@ void TestRegMap::addressesOfMaps_data() {
     QTest::addColumn<int>("map");
     QTest::addColumn<QString>("member");
     QTest::addColumn<int>("address");
-    QTest::newRow("1 Serial_No") << 1 << "Serial_No" << 76;
-    QTest::newRow("1 Sig_Lmt1_Z above F") << 1 << "Sig_Lmt1_Z" << 75;
+    // Columns are easily shifted: these rows differ between neighbouring maps.
     QTest::newRow("2 Buss_ID") << 2 << "Buss_ID" << 93;
-    QTest::newRow("5 Buss_ID differs from 2") << 5 << "Buss_ID" << 92;
+    QTest::newRow("5 Buss_ID") << 5 << "Buss_ID" << 92;
     QTest::newRow("3 Int_Ref swapped") << 3 << "Int_Ref" << 69;
     QTest::newRow("3 Revision swapped") << 3 << "Revision" << 68;
-    QTest::newRow("3 COUT_F") << 3 << "COUT_F" << 19;
-    QTest::newRow("4 Mod_Type") << 4 << "Mod_Type" << 127;
-    QTest::newRow("1 Mod_Type") << 1 << "Mod_Type" << 255;
-    QTest::newRow("6 Com_Power") << 6 << "Com_Power" << 126;
-    QTest::newRow("6 Meas_Unit_Z gap") << 6 << "Meas_Unit_Z" << 47;
     QTest::newRow("7 MIZ") << 7 << "MIZ" << 100;
-    QTest::newRow("5 Eng_Unit4") << 5 << "Eng_Unit4" << 113;
-    QTest::newRow("2 IO_Dir") << 2 << "IO_Dir" << 102;
     QTest::newRow("5 IO_Dir undefined") << 5 << "IO_Dir" << -1;
-    QTest::newRow("4 Resp1 undefined") << 4 << "Resp1" << -1;
-    QTest::newRow("3 TypInput 16 bit") << 3 << "TypInput" << 28;
-    QTest::newRow("1 TypInput undefined") << 1 << "TypInput" << -1;
+    QTest::newRow("6 floating") << 6 << "Trig_Level_RT" << 76;
+    QTest::newRow("3 16 bit") << 3 << "TypInput" << 28;
 }
 
 void TestRegMap::addressesOfMaps() {
@@ -65,15 +55,6 @@ void TestRegMap::addressesOfMaps() {
     QFETCH(QString, member);
     QFETCH(int, address);
     QCOMPARE(rowNamed(member.toLatin1()).field.address(RegMapFor(map)), address);
-}
-
-void TestRegMap::floatingAddressesRound() {
-    const RegMap map6 = RegMapFor(6);
-    QCOMPARE(map6.In_Freq, 71.0f);
-    QCOMPARE(map6.Trig_Level_RT, 76.0f);
-    QCOMPARE(RegMapFor(1).Eng_In_Z, -1.0f);
-    QCOMPARE(RegMapFor(3).TypInput, qint16(28));
-    QCOMPARE(RegMapFor(1).TypInput, qint16(-1));
 }
 
 void TestRegMap::unknownMapsDefineNothing_data() {

@@ -26,7 +26,8 @@ public:
 
     bool hasText(const QString& text) const {
         for (const CapturedLine& line : lines)
-            if (line.text == text) return true;
+            if (line.text == text)
+                return true;
         return false;
     }
 

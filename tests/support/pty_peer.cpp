@@ -11,7 +11,8 @@
 
 PtyPeer::PtyPeer(qint16 port) : port_(port) {
     masterFd_ = posix_openpt(O_RDWR | O_NOCTTY | O_CLOEXEC);
-    if (masterFd_ < 0 || grantpt(masterFd_) != 0 || unlockpt(masterFd_) != 0) return;
+    if (masterFd_ < 0 || grantpt(masterFd_) != 0 || unlockpt(masterFd_) != 0)
+        return;
     slavePath_ = QString::fromLocal8Bit(ptsname(masterFd_));
     slaveFd_ = ::open(slavePath_.toLocal8Bit().constData(), O_RDWR | O_NOCTTY | O_CLOEXEC);
     termios tio{};
@@ -25,9 +26,12 @@ PtyPeer::PtyPeer(qint16 port) : port_(port) {
 
 PtyPeer::~PtyPeer() {
     stop_ = true;
-    if (thread_.joinable()) thread_.join();
-    if (slaveFd_ >= 0) ::close(slaveFd_);
-    if (masterFd_ >= 0) ::close(masterFd_);
+    if (thread_.joinable())
+        thread_.join();
+    if (slaveFd_ >= 0)
+        ::close(slaveFd_);
+    if (masterFd_ >= 0)
+        ::close(masterFd_);
 }
 
 void PtyPeer::setResponder(PeerResponder responder) {
@@ -52,10 +56,12 @@ void PtyPeer::run() {
     QByteArray pending;
     while (!stop_) {
         pollfd p{masterFd_, POLLIN, 0};
-        if (poll(&p, 1, 5) <= 0 || !(p.revents & POLLIN)) continue;
+        if (poll(&p, 1, 5) <= 0 || !(p.revents & POLLIN))
+            continue;
         char buffer[256];
         const ssize_t n = ::read(masterFd_, buffer, sizeof buffer);
-        if (n <= 0) continue;
+        if (n <= 0)
+            continue;
         PeerResponder responder;
         {
             std::lock_guard<std::mutex> lock(mutex_);
@@ -77,7 +83,8 @@ void PtyPeer::run() {
             const QByteArray frame = pending.mid(start, 16);
             pending.remove(0, start + 16);
             ++frames_;
-            if (!responder) continue;
+            if (!responder)
+                continue;
             for (const PeerChunk& chunk : responder(frame)) {
                 if (chunk.delayMs > 0)
                     std::this_thread::sleep_for(std::chrono::milliseconds(chunk.delayMs));

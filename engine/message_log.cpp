@@ -1,0 +1,62 @@
+#include "engine/message_log.h"
+
+#include "model/codec.h"
+
+namespace kv {
+
+MessageLog::MessageLog(QObject* parent) : QObject(parent) { previous_ = SetDiagnosticSink(this); }
+
+MessageLog::~MessageLog() { SetDiagnosticSink(previous_); }
+
+void MessageLog::setOption(int option, bool on) {
+    if (option >= 0 && option < int(options_.size()))
+        options_[option] = on;
+}
+
+bool MessageLog::option(int option) const {
+    return option >= 0 && option < int(options_.size()) && options_[option];
+}
+
+void MessageLog::clear() {
+    text_.clear();
+    emit logChanged();
+}
+
+void MessageLog::statusTick() {
+    if (statusCounter_ < StatusVisibleTicks && ++statusCounter_ == StatusVisibleTicks) {
+        statusVisible_ = false;
+        emit statusVisibilityChanged(false);
+    }
+}
+
+void MessageLog::debugMessage(int level, const QString& tag, const QString& text,
+                              const QByteArray& data, const QString& kind) {
+    if (DebugFlag() && level >= DiagSend && level <= DiagSerialStep && options_[level]) {
+        const QString separator = level == DiagSerialStep ? QString() : QStringLiteral(":");
+        append(tag + separator + kind + text + StrToHex(data) + QLatin1Char('\n'));
+    }
+}
+
+void MessageLog::addMessage(const QString& text) {
+    if (DebugFlag())
+        append(text);
+}
+
+void MessageLog::showStatus(const QString& text) {
+    status_ = text;
+    statusCounter_ = 0;
+    const bool wasHidden = !statusVisible_;
+    statusVisible_ = true;
+    emit statusChanged(text);
+    if (wasHidden)
+        emit statusVisibilityChanged(true);
+}
+
+void MessageLog::append(const QString& text) {
+    if (text_.size() > LogLimit)
+        text_.remove(0, LogDropped);
+    text_ += text;
+    emit logChanged();
+}
+
+}  // namespace kv
