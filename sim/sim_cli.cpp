@@ -94,8 +94,10 @@ void addOptions(QCommandLineParser& parser) {
 
 bool readModel(const QCommandLineParser& parser, const QString& name, ModuleIdentity& identity,
                QString& error) {
-    if (!parser.isSet(name)) return true;
-    if (ParseModel(parser.value(name), identity)) return true;
+    if (!parser.isSet(name))
+        return true;
+    if (ParseModel(parser.value(name), identity))
+        return true;
     error = QStringLiteral("--%1: unknown model \"%2\"; known: %3")
                 .arg(name, parser.value(name), KnownModels());
     return false;
@@ -103,7 +105,8 @@ bool readModel(const QCommandLineParser& parser, const QString& name, ModuleIden
 
 bool readInteger(const QCommandLineParser& parser, const QString& name, qint64 minimum,
                  qint64& value, QString& error) {
-    if (!parser.isSet(name)) return true;
+    if (!parser.isSet(name))
+        return true;
     bool ok = false;
     const qint64 read = parser.value(name).toLongLong(&ok, 0);
     if (!ok || read < minimum || read > std::numeric_limits<qint32>::max()) {
@@ -134,12 +137,17 @@ bool ParseSimArguments(const QStringList& arguments, SimCommandLine& command, QS
     SimOptions& options = command.options;
     for (const NumberOption& option : numberOptions) {
         const QString name = QLatin1String(option.name);
-        if (!parser.isSet(name)) continue;
+        if (!parser.isSet(name))
+            continue;
         qint64 value = 0;
-        if (!readInteger(parser, name, option.minimum, value, error)) return false;
-        if (option.target) command.*option.target = int(value);
-        if (option.faultTarget) options.faults.*option.faultTarget = int(value);
-        if (option.optionTarget) options.*option.optionTarget = int(value);
+        if (!readInteger(parser, name, option.minimum, value, error))
+            return false;
+        if (option.target)
+            command.*option.target = int(value);
+        if (option.faultTarget)
+            options.faults.*option.faultTarget = int(value);
+        if (option.optionTarget)
+            options.*option.optionTarget = int(value);
     }
     if (options.adapter > 1) {
         error = QStringLiteral("--adapter: only 0 and 1 exist");
@@ -147,7 +155,8 @@ bool ParseSimArguments(const QStringList& arguments, SimCommandLine& command, QS
     }
 
     ModuleIdentity& module = options.module;
-    if (!readModel(parser, QStringLiteral("model"), module, error)) return false;
+    if (!readModel(parser, QStringLiteral("model"), module, error))
+        return false;
     qint64 serial = module.serial;
     qint64 busId = module.busId;
     if (!readInteger(parser, QStringLiteral("serial"), 0, serial, error) ||
@@ -164,12 +173,14 @@ bool ParseSimArguments(const QStringList& arguments, SimCommandLine& command, QS
     if (!readModel(parser, QStringLiteral("swap-model"), options.faults.swapTo, error))
         return false;
     qint64 swapSerial = options.faults.swapTo.serial;
-    if (!readInteger(parser, QStringLiteral("swap-serial"), 0, swapSerial, error)) return false;
+    if (!readInteger(parser, QStringLiteral("swap-serial"), 0, swapSerial, error))
+        return false;
     options.faults.swapTo.serial = qint32(swapSerial);
 
     qint64 number = 0;
     if (parser.isSet(QStringLiteral("trim-verdict"))) {
-        if (!readInteger(parser, QStringLiteral("trim-verdict"), 0, number, error)) return false;
+        if (!readInteger(parser, QStringLiteral("trim-verdict"), 0, number, error))
+            return false;
         options.trimVerdict = qint32(number);
     }
     if (parser.isSet(QStringLiteral("hold-reading"))) {
@@ -179,7 +190,8 @@ bool ParseSimArguments(const QStringList& arguments, SimCommandLine& command, QS
         options.heldReading = qint32(number);
     }
     number = options.seed;
-    if (!readInteger(parser, QStringLiteral("seed"), 0, number, error)) return false;
+    if (!readInteger(parser, QStringLiteral("seed"), 0, number, error))
+        return false;
     options.seed = quint32(number);
     return true;
 }

@@ -31,7 +31,8 @@ constexpr FamilyScale familyScales[] = {
 
 const FamilyScale* scaleOf(int family) {
     for (const FamilyScale& scale : familyScales)
-        if (scale.family == family) return &scale;
+        if (scale.family == family)
+            return &scale;
     return nullptr;
 }
 
@@ -138,7 +139,8 @@ qint32 deviation(qint32 serial, int address) {
 
 void put(FactoryImage& image, const RegMap& map, const RegField& field, double value) {
     const int address = field.address(map);
-    if (address < 0 || address >= RegisterCount || std::isnan(value)) return;
+    if (address < 0 || address >= RegisterCount || std::isnan(value))
+        return;
     if (field.width() == RegWidth::Single) {
         const float single = float(value);
         quint32 bits;
@@ -150,7 +152,8 @@ void put(FactoryImage& image, const RegMap& map, const RegField& field, double v
 }
 
 void fillRanges(FactoryImage& image, const RegMap& map, const FamilyScale& scale, qint32 serial) {
-    if (map.Rng_First < 0) return;
+    if (map.Rng_First < 0)
+        return;
     for (int address = map.Rng_First; address <= map.Rng_Last; ++address) {
         const bool low = scale.pairs && address % 2 == 0;
         image.registers[address] = (low ? scale.low : scale.high) + deviation(serial, address);

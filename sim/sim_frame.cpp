@@ -41,7 +41,8 @@ QByteArray NibbleText(quint32 value, int digits) {
 bool NibbleValue(const QByteArray& text, quint32& value) {
     quint32 result = 0;
     for (char c : text) {
-        if (!isNibbleChar(c)) return false;
+        if (!isNibbleChar(c))
+            return false;
         result = (result << 4) | quint32(quint8(c) - 0x30);
     }
     value = result;
@@ -58,19 +59,24 @@ QByteArray EncodeReply(const Request& request, const QByteArray& data, char stat
     body.append(status);
     body.append(Etx);
     QByteArray check = CheckCharacters(body);
-    if (corruptCheck) check[1] = char(0x30 + ((quint8(check[1]) - 0x30 + 1) & 0x0F));
+    if (corruptCheck)
+        check[1] = char(0x30 + ((quint8(check[1]) - 0x30 + 1) & 0x0F));
     return QByteArray(1, Stx) + body + check;
 }
 
 bool DecodeRequest(const QByteArray& frame, Request& request) {
-    if (frame.size() != FrameSize || frame[0] != Stx || frame[EtxPos] != Etx) return false;
-    if (frame[StatusPos] != RequestStatus) return false;
-    if (frame.mid(EtxPos + 1, 2) != CheckCharacters(frame.mid(1, EtxPos))) return false;
+    if (frame.size() != FrameSize || frame[0] != Stx || frame[EtxPos] != Etx)
+        return false;
+    if (frame[StatusPos] != RequestStatus)
+        return false;
+    if (frame.mid(EtxPos + 1, 2) != CheckCharacters(frame.mid(1, EtxPos)))
+        return false;
     const char command = frame[1];
     const QByteArray data = frame.mid(4, DataSize);
     quint32 unused = 0;
     if (command == 'W') {
-        if (!NibbleValue(data, unused)) return false;
+        if (!NibbleValue(data, unused))
+            return false;
     } else if (command != 'R') {
         return false;
     }
@@ -87,7 +93,8 @@ void FrameScanner::feed(const QByteArray& bytes, std::vector<Event>& events) {
     while (at < buffer_.size()) {
         const char byte = buffer_[at];
         if (byte == Stx) {
-            if (buffer_.size() - at < FrameSize) break;  // wait for the rest
+            if (buffer_.size() - at < FrameSize)
+                break;  // wait for the rest
             Request request;
             if (DecodeRequest(buffer_.mid(at, FrameSize), request)) {
                 Event event;

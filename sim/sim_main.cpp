@@ -57,9 +57,11 @@ int main(int argc, char* argv[]) {
     qint64 shown = 0;
     const timespec poll{0, 200 * 1000 * 1000};
     while (sigtimedwait(&stopSignals, nullptr, &poll) < 0) {
-        if (!command.logFrames) continue;
+        if (!command.logFrames)
+            continue;
         for (const SimLogEntry& entry : simulator.log()) {
-            if (entry.sequence < shown) continue;
+            if (entry.sequence < shown)
+                continue;
             out << DescribeLogEntry(entry) << "\n";
             shown = entry.sequence + 1;
         }

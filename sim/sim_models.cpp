@@ -37,7 +37,8 @@ bool textNamesSubType(int typeCode) {
 
 int FamilyOfType(int typeCode) {
     for (const FamilyRow& row : familyRows)
-        if (row.typeCode == typeCode) return row.family;
+        if (row.typeCode == typeCode)
+            return row.family;
     return 0;
 }
 
@@ -52,9 +53,11 @@ bool ParseModel(const QString& text, ModuleIdentity& identity) {
     }
     static const QRegularExpression codeForm(QStringLiteral("^(\\d{1,3})(?::(-?\\d{1,5}))?$"));
     const QRegularExpressionMatch match = codeForm.match(wanted);
-    if (!match.hasMatch()) return false;
+    if (!match.hasMatch())
+        return false;
     const int code = match.captured(1).toInt();
-    if (code > 255) return false;
+    if (code > 255)
+        return false;
     identity.typeCode = code;
     identity.subType = 0;
     for (const ModelRow& row : modelRows) {
@@ -63,7 +66,8 @@ bool ParseModel(const QString& text, ModuleIdentity& identity) {
             break;
         }
     }
-    if (match.hasCaptured(2)) identity.subType = match.captured(2).toInt();
+    if (match.hasCaptured(2))
+        identity.subType = match.captured(2).toInt();
     return true;
 }
 

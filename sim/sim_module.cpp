@@ -88,7 +88,8 @@ std::unique_ptr<SimModule> SimModule::replacedBy(const ModuleIdentity& identity)
 
 SimModule::Part SimModule::partAt(int address) const {
     const RegisterRow* row = FindRegister(map_, address);
-    if (!row) return Part::None;
+    if (!row)
+        return Part::None;
     switch (row->role) {
     case RegRole::TablePart:
         return row->field.is(&RegMap::Table1) ? Part::Table1 : Part::TableC;
@@ -115,12 +116,14 @@ bool SimModule::isLive(int address) const {
                         addressOf(map_.Pulse_Peak_Raw),
                         addressOf(map_.Trig_Level_RT)};
     for (int liveAddress : live)
-        if (address == liveAddress) return true;
+        if (address == liveAddress)
+            return true;
     return false;
 }
 
 bool SimModule::isReadOnly(int address) const {
-    if (isLive(address)) return true;
+    if (isLive(address))
+        return true;
     const RegisterRow* row = FindRegister(map_, address);
     return row && row->access == RegAccess::ReadOnly;
 }
@@ -135,7 +138,8 @@ double SimModule::seconds() const {
 }
 
 qint32 SimModule::reading() const {
-    if (heldReading_) return *heldReading_;
+    if (heldReading_)
+        return *heldReading_;
     const double phase = std::fmod(seconds(), ReadingPeriodS) / ReadingPeriodS;
     const double sweep = phase < 0.5 ? 2 * phase : 2 - 2 * phase;
     double zero = 0;
@@ -150,11 +154,15 @@ qint32 SimModule::reading() const {
 }
 
 qint32 SimModule::liveValue(int address) const {
-    if (address == universalTypeAddress || address == map_.Mod_Type) return identity_.typeCode;
-    if (address == map_.Input_Reading || address == map_.Input_B4_Table) return reading();
+    if (address == universalTypeAddress || address == map_.Mod_Type)
+        return identity_.typeCode;
+    if (address == map_.Input_Reading || address == map_.Input_B4_Table)
+        return reading();
     const double drift = std::sin(2 * M_PI * seconds() / TempPeriodS);
-    if (address == map_.Int_Temp) return InternalTemp + qint32(std::lround(drift));
-    if (address == map_.Term_Temp) return TerminalTemp + qint32(std::lround(drift));
+    if (address == map_.Int_Temp)
+        return InternalTemp + qint32(std::lround(drift));
+    if (address == map_.Term_Temp)
+        return TerminalTemp + qint32(std::lround(drift));
 
     const qint32 flags = reg(map_.Flag_A);
     if (address == addressOf(map_.Trig_Level_RT)) {
@@ -169,22 +177,29 @@ qint32 SimModule::liveValue(int address) const {
     const bool highPulses = ((reg(map_.Type_In_Unit) >> 4) & 7) == HighPulseType;
     const double valley = highPulses ? HighPulseValleyV * HighPulseFactor : PulseValleyV;
     const double peak = highPulses ? HighPulsePeakV * HighPulseFactor : PulsePeakV;
-    if (address == addressOf(map_.Pulse_Valley)) return singleBits(valley);
-    if (address == addressOf(map_.Pulse_Peak)) return singleBits(peak);
-    if (address == addressOf(map_.Pulse_Valley_Raw)) return singleBits(valley * RawPulseFactor);
+    if (address == addressOf(map_.Pulse_Valley))
+        return singleBits(valley);
+    if (address == addressOf(map_.Pulse_Peak))
+        return singleBits(peak);
+    if (address == addressOf(map_.Pulse_Valley_Raw))
+        return singleBits(valley * RawPulseFactor);
     return singleBits(peak * RawPulseFactor);
 }
 
 qint32 SimModule::value(int address) const {
-    if (address < 0 || address >= RegisterCount) return 0;
+    if (address < 0 || address >= RegisterCount)
+        return 0;
     const Part part = partAt(address);
-    if (part != Part::None) return qint32(nibbles(readPart(part, FirstPart).data));
-    if (isLive(address)) return liveValue(address);
+    if (part != Part::None)
+        return qint32(nibbles(readPart(part, FirstPart).data));
+    if (isLive(address))
+        return liveValue(address);
     return image_.registers[address];
 }
 
 void SimModule::setValue(int address, qint32 value) {
-    if (address < 0 || address >= RegisterCount) return;
+    if (address < 0 || address >= RegisterCount)
+        return;
     image_.registers[address] = isSixteenBit(address) ? qint16(value) : value;
 }
 
@@ -218,7 +233,8 @@ SimModule::Answer SimModule::readPart(Part part, int busId) const {
     const int k = busId - FirstPart;
     switch (part) {
     case Part::FileName:
-        if (isPart(FileNameIds, busId)) answer.data = byteText(image_.fileName.mid(k, 4));
+        if (isPart(FileNameIds, busId))
+            answer.data = byteText(image_.fileName.mid(k, 4));
         break;
     case Part::Table1:
     case Part::TableC: {
@@ -249,21 +265,24 @@ SimModule::Answer SimModule::writePart(Part part, int busId, const QByteArray& d
     const int k = busId - FirstPart;
     switch (part) {
     case Part::FileName:
-        if (!isPart(FileNameIds, busId)) break;
+        if (!isPart(FileNameIds, busId))
+            break;
         for (int i = 0; i < 4; ++i)
             image_.fileName[k + i] = char(nibbles(data.mid(2 * i, 2)));
         break;
     case Part::Table1:
     case Part::TableC: {
         std::vector<qint32>& points = part == Part::Table1 ? image_.table1 : image_.tableC;
-        if (k < 0 || k + 1 >= int(points.size())) break;
+        if (k < 0 || k + 1 >= int(points.size()))
+            break;
         points[k] = qint32(nibbles(data.left(4)));
         points[k + 1] = qint32(nibbles(data.mid(4, 4)));
         break;
     }
     case Part::CalErrors: {
         Answer answer = readPart(part, busId);
-        if (answer.status == StatusDone) answer.status = StatusReadOnly;
+        if (answer.status == StatusDone)
+            answer.status = StatusReadOnly;
         return answer;
     }
     case Part::None:
@@ -282,7 +301,8 @@ void SimModule::trim(qint32 code) {
     const bool inWindow = std::abs(now - target) <= TrimWindow;
     const qint32 verdict = trimVerdict_ ? *trimVerdict_ : inWindow ? TrimDone : TrimOutOfRange;
     setReg(map_.Minor_Cal, verdict);
-    if (verdict != TrimDone) return;
+    if (verdict != TrimDone)
+        return;
     if (code == TrimZero) {
         // Move the zero so that the input present now reads as zero.
         const qint32 zero = reg(map_.Usr_In1_Z);
@@ -299,7 +319,8 @@ qint32 SimModule::reg(int address) const {
 }
 
 void SimModule::setReg(int address, qint32 value) {
-    if (address >= 0 && address < RegisterCount) image_.registers[address] = value;
+    if (address >= 0 && address < RegisterCount)
+        image_.registers[address] = value;
 }
 
 }  // namespace kv::sim

@@ -42,7 +42,8 @@ bool PortLink::publish(int port, const QString& device, QString& error) {
 }
 
 void PortLink::remove() {
-    if (link_.isEmpty()) return;
+    if (link_.isEmpty())
+        return;
     if (QFileInfo(link_).symLinkTarget() == QFileInfo(target_).absoluteFilePath())
         QFile::remove(link_);
     link_.clear();
@@ -50,12 +51,14 @@ void PortLink::remove() {
 }
 
 bool PortLock::hold(const QString& device, QString& error) {
-    if (held()) return true;
+    if (held())
+        return true;
     const int fd = ::open(device.toLocal8Bit().constData(), O_RDWR | O_NOCTTY | O_CLOEXEC);
     if (fd < 0 || flock(fd, LOCK_EX | LOCK_NB) != 0) {
         error = QStringLiteral("cannot hold %1: %2")
                     .arg(device, QString::fromLocal8Bit(strerror(errno)));
-        if (fd >= 0) ::close(fd);
+        if (fd >= 0)
+            ::close(fd);
         return false;
     }
     fd_ = fd;
@@ -63,7 +66,8 @@ bool PortLock::hold(const QString& device, QString& error) {
 }
 
 void PortLock::release() {
-    if (fd_ < 0) return;
+    if (fd_ < 0)
+        return;
     flock(fd_, LOCK_UN);
     ::close(fd_);
     fd_ = -1;

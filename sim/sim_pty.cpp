@@ -57,8 +57,10 @@ bool PseudoTerminal::open(QString& error) {
 }
 
 void PseudoTerminal::close() {
-    if (slave_ >= 0) ::close(slave_);
-    if (master_ >= 0) ::close(master_);
+    if (slave_ >= 0)
+        ::close(slave_);
+    if (master_ >= 0)
+        ::close(master_);
     slave_ = -1;
     master_ = -1;
     slavePath_.clear();

@@ -73,7 +73,8 @@ struct Simulator::State {
     }
     void wake() const {
         const quint64 one = 1;
-        if (wakeFd >= 0) (void)!write(wakeFd, &one, sizeof one);
+        if (wakeFd >= 0)
+            (void)!write(wakeFd, &one, sizeof one);
     }
 
     void run();
@@ -101,8 +102,10 @@ Simulator::~Simulator() {
 }
 
 bool Simulator::start(QString& error) {
-    if (isRunning()) return true;
-    if (!d->pty.open(error)) return false;
+    if (isRunning())
+        return true;
+    if (!d->pty.open(error))
+        return false;
     d->wakeFd = eventfd(0, EFD_NONBLOCK | EFD_CLOEXEC);
     if (d->wakeFd < 0) {
         error = QStringLiteral("eventfd failed");
@@ -123,7 +126,8 @@ void Simulator::stop() {
     std::lock_guard<std::mutex> guard(d->mutex);
     d->link.remove();
     d->lock.release();
-    if (d->wakeFd >= 0) close(d->wakeFd);
+    if (d->wakeFd >= 0)
+        close(d->wakeFd);
     d->wakeFd = -1;
     d->pty.close();
 }
@@ -262,12 +266,15 @@ void Simulator::State::run() {
         }
         pollfd fds[2] = {{pty.masterFd(), short(POLLIN | (wantWrite ? POLLOUT : 0)), 0},
                          {wakeFd, POLLIN, 0}};
-        if (poll(fds, 2, waitMs) < 0 && errno != EINTR) return;
+        if (poll(fds, 2, waitMs) < 0 && errno != EINTR)
+            return;
         if (fds[1].revents & POLLIN) {
             quint64 count = 0;
-            if (read(wakeFd, &count, sizeof count) == sizeof count && count >= StopMark) return;
+            if (read(wakeFd, &count, sizeof count) == sizeof count && count >= StopMark)
+                return;
         }
-        if (!(fds[0].revents & POLLIN)) continue;
+        if (!(fds[0].revents & POLLIN))
+            continue;
         const ssize_t n = read(pty.masterFd(), buffer, sizeof buffer);
         if (n <= 0) {
             // Cannot happen while our own slave descriptor is open; do not spin if it does.
@@ -294,9 +301,11 @@ bool Simulator::State::flushOutgoing(int& waitMs) {
             return false;
         }
         const ssize_t n = write(pty.masterFd(), next.bytes.constData(), size_t(next.bytes.size()));
-        if (n < 0) return errno == EAGAIN || errno == EINTR;
+        if (n < 0)
+            return errno == EAGAIN || errno == EINTR;
         next.bytes.remove(0, int(n));
-        if (!next.bytes.isEmpty()) return true;
+        if (!next.bytes.isEmpty())
+            return true;
         outgoing.pop_front();
     }
     return false;
@@ -332,7 +341,8 @@ void Simulator::State::noteIgnored(const QByteArray& bytes) {
 }
 
 void Simulator::State::append(SimLogEntry entry) {
-    if (log.size() >= LogLimit) log.erase(log.begin(), log.begin() + LogDrop);
+    if (log.size() >= LogLimit)
+        log.erase(log.begin(), log.begin() + LogDrop);
     entry.sequence = logged++;
     entry.msec = msecNow();
     log.push_back(entry);
@@ -341,7 +351,8 @@ void Simulator::State::append(SimLogEntry entry) {
 void Simulator::State::notePriming(int count) {
     priming += count;
     primingRun += count;
-    if (awaitingPriming.isEmpty()) return;
+    if (awaitingPriming.isEmpty())
+        return;
     primingSinceFrame += count;
     if (primingSinceFrame >= PrimingToRelease) {
         schedule(awaitingPriming);
@@ -376,7 +387,8 @@ void Simulator::State::handleFrame(const Request& request) {
     append(entry);
     if (faults.swapAfter >= 0 && number == faults.swapAfter)
         module = module->replacedBy(faults.swapTo);
-    if (dropped) return;
+    if (dropped)
+        return;
 
     const bool corrupt = faults.corruptEvery > 0 && number % faults.corruptEvery == 0;
     QByteArray reply = EncodeReply(request, answer.data, answer.status, corrupt);
@@ -384,7 +396,8 @@ void Simulator::State::handleFrame(const Request& request) {
     QByteArray noise;
     while (noise.size() < faults.noiseBytes) {
         const char byte = char(byteValue(random));
-        if (byte != Stx) noise.append(byte);
+        if (byte != Stx)
+            noise.append(byte);
     }
     reply.prepend(noise);
 
@@ -393,7 +406,8 @@ void Simulator::State::handleFrame(const Request& request) {
         return;
     }
     schedule(reply);
-    if (options.adapter == 1) scheduleSelfTestTail(outgoing.back().due);
+    if (options.adapter == 1)
+        scheduleSelfTestTail(outgoing.back().due);
 }
 
 void Simulator::State::schedule(QByteArray reply) {

@@ -36,9 +36,12 @@ Counts scan(FrameScanner& scanner, const QByteArray& bytes) {
     scanner.feed(bytes, events);
     Counts counts;
     for (const FrameScanner::Event& event : events) {
-        if (event.kind == FrameScanner::Event::Frame) ++counts.frames;
-        if (event.kind == FrameScanner::Event::Priming) counts.priming += int(event.bytes.size());
-        if (event.kind == FrameScanner::Event::Garbage) counts.garbage += int(event.bytes.size());
+        if (event.kind == FrameScanner::Event::Frame)
+            ++counts.frames;
+        if (event.kind == FrameScanner::Event::Priming)
+            counts.priming += int(event.bytes.size());
+        if (event.kind == FrameScanner::Event::Garbage)
+            counts.garbage += int(event.bytes.size());
     }
     return counts;
 }
@@ -198,7 +201,8 @@ void TestSimModule::modelForms() {
     QFETCH(int, subType);
     ModuleIdentity identity;
     QCOMPARE(ParseModel(text, identity), known);
-    if (!known) return;
+    if (!known)
+        return;
     QCOMPARE(identity.typeCode, typeCode);
     QCOMPARE(identity.subType, subType);
 }
@@ -236,20 +240,24 @@ void TestSimModule::factoryStateIsUsable() {
     const bool pairs = family != 3;
     for (int address = map.Rng_First; address <= map.Rng_Last; ++address) {
         QVERIFY2(at(address) != 0, qPrintable(QString::number(address)));
-        if (!pairs || address % 2) continue;
+        if (!pairs || address % 2)
+            continue;
         const qint32 low = at(address);
         const qint32 high = at(address + 1);
         QVERIFY(low < high);
         QVERIFY(low - 0.0625 * (high - low) >= 0);
-        if (family <= 2) QVERIFY(high < 4090);  // first-version readings stay below "Input Hi"
+        if (family <= 2)
+            QVERIFY(high < 4090);  // first-version readings stay below "Input Hi"
     }
 
     // User calibration the program converts back: no count may be 0.
     for (qint32 address : {map.Usr_In1_Z, map.Usr_In1_F, map.Usr_Out1_Z, map.Usr_Out1_F,
                            map.Sig_Lmt1_Z, map.Sig_Lmt1_F, map.Usr_Out2_Z, map.Usr_Out2_F})
-        if (address >= 0) QVERIFY2(at(address) != 0, qPrintable(QString::number(address)));
+        if (address >= 0)
+            QVERIFY2(at(address) != 0, qPrintable(QString::number(address)));
     for (qint32 address : {map.Sw_In1, map.Sw_Out1, map.Sw_Out2})
-        if (address >= 0) QCOMPARE(at(address), 15);
+        if (address >= 0)
+            QCOMPARE(at(address), 15);
 
     // Excitation sources: a band whose ends coincide cannot be converted back.
     const std::pair<qint32, qint32> bands[] = {{map.IS_ZS1, map.IS_FS1},
@@ -257,7 +265,8 @@ void TestSimModule::factoryStateIsUsable() {
                                                {map.VS_ZS1, map.VS_FS1},
                                                {map.VS_ZS2, map.VS_FS2}};
     for (const auto& [zero, full] : bands)
-        if (zero >= 0) QVERIFY(at(full) > at(zero) && at(zero) > 0);
+        if (zero >= 0)
+            QVERIFY(at(full) > at(zero) && at(zero) > 0);
 
     if (family == 3) {
         QVERIFY(at(map.CIN_F) > at(map.CIN_Z));
@@ -270,7 +279,8 @@ void TestSimModule::factoryStateIsUsable() {
         QCOMPARE(at(map.Minor_Cal), 0);
     }
     const qint32 reading = at(map.Input_Reading);
-    if (family > 2) QVERIFY(reading >= -500 && reading <= 10500);
+    if (family > 2)
+        QVERIFY(reading >= -500 && reading <= 10500);
 }
 
 void TestSimModule::factoryTables() {

@@ -74,7 +74,8 @@ class Bench {
 public:
     explicit Bench(const SimOptions& options = {}) : sim(options), port(nextPort++) {
         QString error;
-        if (!sim.start(error) || !sim.publishAsPort(port, error)) qWarning() << error;
+        if (!sim.start(error) || !sim.publishAsPort(port, error))
+            qWarning() << error;
     }
 
     Exchange transact(const QByteArray& text, qint16 connector = ConnectorPlain,
@@ -171,7 +172,8 @@ void TestSimulator::identifiesEveryFamily() {
     QCOMPARE(bench.read(RegMap().Mod_Type), options.module.typeCode);
     QCOMPARE(bench.read(map.Mod_Type), options.module.typeCode);
     QCOMPARE(bench.read(map.Serial_No), 4711);
-    if (map.TypInput >= 0) QCOMPARE(bench.read(map.TypInput), options.module.subType);
+    if (map.TypInput >= 0)
+        QCOMPARE(bench.read(map.TypInput), options.module.subType);
     QCOMPARE(ModelText(options.module.typeCode, qint16(options.module.subType)), model);
 }
 
@@ -337,7 +339,8 @@ void TestSimulator::minorTrimVerdicts() {
     QFETCH(int, verdict);
     SimOptions options = optionsFor("KV720-20");
     options.heldReading = reading;
-    if (forced >= 0) options.trimVerdict = forced;
+    if (forced >= 0)
+        options.trimVerdict = forced;
     Bench bench(options);
     const RegMap map = mapOf(bench.sim.module());
     const qint32 zero = bench.read(map.Usr_In1_Z);
@@ -455,7 +458,8 @@ void TestSimulator::splitReplyStillArrives() {
     // The program's own trace of its reads shows the reply growing piece by piece.
     QList<int> held;
     for (const CapturedLine& line : capture.lines)
-        if (line.text.endsWith(QLatin1String(" +"))) held << int(line.data.size());
+        if (line.text.endsWith(QLatin1String(" +")))
+            held << int(line.data.size());
     QVERIFY(!held.isEmpty());
     QVERIFY2(held.first() < FrameLength, qPrintable(QString::number(held.first())));
     QCOMPARE(held.last(), FrameLength);
@@ -563,7 +567,8 @@ void TestSimulator::adapterSelfTest() {
     }
     QCOMPARE(outcome.passed, passes);
     QVERIFY2(outcome.report.startsWith(reportStart), qPrintable(outcome.report));
-    if (decayMs > 200) QVERIFY2(outcome.report.contains("> 200mS"), qPrintable(outcome.report));
+    if (decayMs > 200)
+        QVERIFY2(outcome.report.contains("> 200mS"), qPrintable(outcome.report));
 }
 
 void TestSimulator::garbageIsIgnoredAndCounted() {
@@ -584,7 +589,8 @@ void TestSimulator::garbageIsIgnoredAndCounted() {
     pollfd p{fd, POLLIN, 0};
     while (received.size() < FrameLength && poll(&p, 1, 2000) > 0) {
         const ssize_t n = ::read(fd, buffer, sizeof buffer);
-        if (n <= 0) break;
+        if (n <= 0)
+            break;
         received.append(buffer, int(n));
     }
     // Nothing more may follow: the bad frame got no answer.
