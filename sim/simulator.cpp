@@ -33,9 +33,6 @@ constexpr int TailStepMs = 5;
 constexpr std::size_t LogLimit = 10000;
 constexpr std::size_t LogDrop = 1000;
 
-// Added to the wake-up counter to end the thread; ordinary wake-ups add 1.
-constexpr quint64 StopMark = 1ull << 40;
-
 struct Outgoing {
     Clock::time_point due;
     QByteArray bytes;
@@ -43,9 +40,15 @@ struct Outgoing {
 }  // namespace
 
 struct Simulator::State {
-    SimOptions options;
+    // Set up by start() and stop(); the scanner belongs to the thread.
+    PseudoTerminal pty;
+    FrameScanner scanner;
+    Clock::time_point started;
+    int stopFd = -1;  // readable once stop() wants the thread to end
+    std::thread thread;
 
     mutable std::mutex mutex;  // guards everything below it
+    SimOptions options;
     std::unique_ptr<SimModule> module;
     SimFaults faults;
     int faultFrames = 0;
@@ -62,19 +65,8 @@ struct Simulator::State {
     PortLink link;
     PortLock lock;
 
-    PseudoTerminal pty;
-    FrameScanner scanner;  // used by the thread only
-    Clock::time_point started;
-    int wakeFd = -1;
-    std::thread thread;
-
     qint64 msecNow() const {
         return std::chrono::duration_cast<milliseconds>(Clock::now() - started).count();
-    }
-    void wake() const {
-        const quint64 one = 1;
-        if (wakeFd >= 0)
-            (void)!write(wakeFd, &one, sizeof one);
     }
 
     void run();
@@ -106,8 +98,8 @@ bool Simulator::start(QString& error) {
         return true;
     if (!d->pty.open(error))
         return false;
-    d->wakeFd = eventfd(0, EFD_NONBLOCK | EFD_CLOEXEC);
-    if (d->wakeFd < 0) {
+    d->stopFd = eventfd(0, EFD_NONBLOCK | EFD_CLOEXEC);
+    if (d->stopFd < 0) {
         error = QStringLiteral("eventfd failed");
         d->pty.close();
         return false;
@@ -120,15 +112,16 @@ bool Simulator::start(QString& error) {
 
 void Simulator::stop() {
     if (d->thread.joinable()) {
-        (void)!write(d->wakeFd, &StopMark, sizeof StopMark);
+        const quint64 one = 1;
+        (void)!write(d->stopFd, &one, sizeof one);
         d->thread.join();
     }
     std::lock_guard<std::mutex> guard(d->mutex);
     d->link.remove();
     d->lock.release();
-    if (d->wakeFd >= 0)
-        close(d->wakeFd);
-    d->wakeFd = -1;
+    if (d->stopFd >= 0)
+        close(d->stopFd);
+    d->stopFd = -1;
     d->pty.close();
 }
 
@@ -265,14 +258,11 @@ void Simulator::State::run() {
             wantWrite = flushOutgoing(waitMs);
         }
         pollfd fds[2] = {{pty.masterFd(), short(POLLIN | (wantWrite ? POLLOUT : 0)), 0},
-                         {wakeFd, POLLIN, 0}};
+                         {stopFd, POLLIN, 0}};
         if (poll(fds, 2, waitMs) < 0 && errno != EINTR)
             return;
-        if (fds[1].revents & POLLIN) {
-            quint64 count = 0;
-            if (read(wakeFd, &count, sizeof count) == sizeof count && count >= StopMark)
-                return;
-        }
+        if (fds[1].revents & POLLIN)
+            return;
         if (!(fds[0].revents & POLLIN))
             continue;
         const ssize_t n = read(pty.masterFd(), buffer, sizeof buffer);
@@ -418,14 +408,12 @@ void Simulator::State::schedule(QByteArray reply) {
         reply.remove(0, piece);
         due += milliseconds(faults.splitGapMs);
     }
-    wake();
 }
 
 void Simulator::State::scheduleSelfTestTail(Clock::time_point from) {
     const QByteArray tail(TailBytes, PrimingByte);
     for (int ms = TailStepMs; ms <= options.adapterDecayMs; ms += TailStepMs)
         outgoing.push_back({from + milliseconds(ms), tail});
-    wake();
 }
 
 }  // namespace kv::sim

@@ -69,7 +69,8 @@ public:
     ModuleIdentity module() const;
     // What a read of `address` would answer now (bus ID 16 for multi-part registers).
     qint32 registerValue(int address) const;
-    // Sets a register as the factory would; read-only registers included.
+    // Sets a register as the factory would, read-only ones included; measured values
+    // follow holdReading instead, multi-part registers their own setters.
     void setRegisterValue(int address, qint32 value);
     QByteArray fileName() const;  // the 20 characters of the stored file name
     std::vector<qint32> table1() const;
