@@ -1,6 +1,10 @@
 #include "drivers/driver_list.h"
 
+#include "drivers/kv7146v1_driver.h"
+#include "drivers/kv7146v2_driver.h"
+#include "drivers/kv718_driver.h"
 #include "drivers/kv720_driver.h"
+#include "drivers/kv760_driver.h"
 
 #include <cstring>
 
@@ -8,7 +12,8 @@ namespace kv {
 
 namespace {
 const DriverDescriptor* const drivers[] = {
-    &Kv720Driver(),
+    &Kv720Driver(),   &Kv760Driver(),   &Kv714v1Driver(), &Kv716v1Driver(),
+    &Kv714v2Driver(), &Kv716v2Driver(), &Kv718Driver(),
 };
 }  // namespace
 
