@@ -1,4 +1,11 @@
+#include "drivers/kv760_driver.h"
 #include "drivers/kv760_input.h"
+#include "drivers/step_runner.h"
+#include "engine/request_engine.h"
+#include "model/linearisation.h"
+#include "model/module_types.h"
+#include "tests/support/diagnostic_capture.h"
+#include "tests/support/driver_bench.h"
 
 #include <QtTest>
 
@@ -42,6 +49,117 @@ RegMap programmed(const KV760Input& input) {
     return values;
 }
 
+constexpr int Kv760Type = 9;
+constexpr int Kv760Map = 6;
+
+// A record as the KV760 window would hand it over.
+SettingsSet kv760Record() {
+    SettingsSet s;
+    s.ModTypeSet = Kv760Type;
+    s.BussIdenti = 5;
+    s.SetFileName(QStringLiteral("PUMP 7 SPEED"));
+    s.Inp1RngTyp = 3;
+    s.Inp1MeUnit = QStringLiteral("Hz");
+    s.Inp1Shape = QStringLiteral("Linear");
+    s.Inp1mU_Zro = 10;
+    s.Inp1mU_Ful = 1000;
+    s.Inp1EngZro = 0;
+    s.Inp1EngFul = 3000;
+    s.Inp1EngUnt = QStringLiteral("rpm ");
+    s.TrigLevel = 2.4f;
+    s.TrigMode = 1;
+    s.AuxImA = 8;
+    s.AuxVmA = 12;
+    s.Out1RngTyp = 3;  // 0-20 mA
+    s.Out1EngZro = 4;
+    s.Out1EngFul = 20;
+    s.Out1SigLmZ = 3.8f;
+    s.Out1SigLmF = 20.5f;
+    for (int i = 0; i <= Table1LastUsed; ++i)
+        s.Table1[i] = i * i;  // a curve, so that a table read back from elsewhere shows
+    TableChecksum(s.Table1.data(), Table1LastUsed);
+    return s;
+}
+
+// The programming order of the KV760, row by row.
+std::vector<drvbench::Frame> kv760Programming() {
+    drvbench::Expect e(Kv760Map);
+    e.read("Mod_Type")
+        .write("Flag_C")
+        .fileName()
+        .write("Eng_Unit1")
+        .write("Eng_Unit2")
+        .write("Eng_Unit3")
+        .write("Eng_Unit4")
+        .write("Eng_In_Z")
+        .write("Eng_In_F")
+        .write("Meas_Unit_Z")
+        .write("Meas_Unit_F")
+        .write("Trig_Level")
+        .write("Aux_C")
+        .write("Aux_V")
+        .write("Out_Rng1")
+        .write("Usr_Out1_Z")
+        .write("Usr_Out1_F")
+        .write("Sig_Lmt1_Z")
+        .write("Sig_Lmt1_F")
+        .write("Flag_A")
+        .write("Type_In_Unit")
+        .table1()
+        .read("Int_Temp")
+        .write("Buss_ID")
+        .data("Flag_C")
+        .read("Remote1");
+    return e.frames();
+}
+
+std::vector<drvbench::Frame> kv760Reading() {
+    drvbench::Expect e(Kv760Map);
+    e.read("Mod_Type")
+        .read("Buss_ID")
+        .fileName(true)
+        .read("TypInput")
+        .read("Meas_Unit_Z")
+        .read("Meas_Unit_F")
+        .read("Eng_In_F")
+        .read("Eng_In_Z")
+        .read("Eng_Unit1")
+        .read("Eng_Unit2")
+        .read("Eng_Unit3")
+        .read("Eng_Unit4")
+        .read("Flag_A")
+        .read("Type_In_Unit")
+        .read("Out_Rng1")
+        .read("Usr_Out1_Z")
+        .read("Usr_Out1_F")
+        .read("Sig_Lmt1_Z")
+        .read("Sig_Lmt1_F")
+        .read("Trig_Level")
+        .read("Aux_C")
+        .read("Aux_V")
+        .table1(true)
+        .read("Remote1")
+        .read("Int_Temp");
+    return e.frames();
+}
+
+// A KV760 map and an idle engine, for single steps without a module.
+struct StepBench {
+    RequestEngine engine;
+    QString requester = QStringLiteral("MCT00007");
+    SettingsSet settings = kv760Record();
+    StepBench() {
+        SetRegMap(RegAdd, Kv760Map);
+        RegVal.Mod_Type = Kv760Type;
+        engine.setState(StateRun);
+    }
+    bool step(qint16 kind, qint32 id, qint16 busId, QString& text) {
+        const bool queued = GS760(engine, kind, requester, settings, id, busId, text);
+        engine.setState(StateRun);  // as if the queued request had been answered
+        return queued;
+    }
+};
+
 }  // namespace
 
 class TestDrv760 : public QObject {
@@ -62,6 +180,18 @@ private slots:
     void readBackGivesTheRecord_data();
     void readBackGivesTheRecord();
     void readBackWithoutSourceCalibrationWarns();
+
+    void programmingRunFollowsTheOrder();
+    void programThenReadGivesTheRecord_data();
+    void programThenReadGivesTheRecord();
+    void wrongModelStopsAtTheFirstStep();
+    void refusedInputStopsBeforeAnyWrite();
+    void outputOutOfRangeNamesTheRegister();
+    void flagCWritesToldApartByTheDriver();
+    void unexpectedFileNamePart();
+    void addressOutsideTheOrder();
+    void lastRegisterBelongsToTheWindow();
+    void unknownDispatcherKind();
 };
 
 void TestDrv760::typeAndUnit_data() {
@@ -319,6 +449,191 @@ void TestDrv760::readBackWithoutSourceCalibrationWarns() {
     KV760ReadInput(values, back, warning);
     QCOMPARE(warning, QStringLiteral("before, kv760AuxRead failed , "));
     QCOMPARE(back.AuxImA, 20.0f);
+}
+
+void TestDrv760::programmingRunFollowsTheOrder() {
+    drvbench::Bench bench(Kv760Type, 0);
+    QVERIFY(bench.ready());
+    QVERIFY2(bench.program(Kv760Driver(), kv760Record()), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString("Programmed"));
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, kv760Programming(), difference),
+             qPrintable(difference));
+
+    // The module ends with its programming flag cleared and the record's values.
+    const RegMap map = RegMapFor(Kv760Map);
+    QCOMPARE(bench.sim->registerValue(map.Flag_C), 0);
+    QCOMPARE(bench.sim->registerValue(map.Type_In_Unit), 0x30);
+    QCOMPARE(bench.sim->registerValue(map.Flag_A), 0x84);  // track mode, NAMUR load, plain band
+    QCOMPARE(bench.sim->registerValue(map.Trig_Level), 23832);  // 2.4 V x 9930
+    QCOMPARE(bench.sim->registerValue(map.Buss_ID), 5);
+    QCOMPARE(bench.sim->fileName(), QByteArray("PUMP 7 SPEED        "));
+    const std::vector<qint32> table = bench.sim->table1();
+    QCOMPARE(table[50], 2500);
+    QCOMPARE(table[101], kv760Record().Table1[101]);
+}
+
+void TestDrv760::programThenReadGivesTheRecord_data() {
+    QTest::addColumn<int>("sensor");
+    QTest::addColumn<QString>("unit");
+    QTest::addColumn<QString>("shape");
+    QTest::addColumn<float>("level");
+    QTest::addColumn<int>("loading");
+    QTest::newRow("NAMUR Hz") << 3 << "Hz"
+                              << "Linear" << 2.4f << 0;
+    QTest::newRow("inductive kHz table") << 5 << "kHz"
+                                         << "Table" << 0.15f << 1;
+    QTest::newRow("HI pulse") << 7 << "Hz"
+                              << "Linear" << 50.0f << 0;
+}
+
+void TestDrv760::programThenReadGivesTheRecord() {
+    drvbench::Bench bench(Kv760Type, 1);
+    QVERIFY(bench.ready());
+    SettingsSet s = kv760Record();
+    QFETCH(int, sensor);
+    QFETCH(QString, unit);
+    QFETCH(QString, shape);
+    QFETCH(float, level);
+    QFETCH(int, loading);
+    s.Inp1RngTyp = sensor;
+    s.Inp1MeUnit = unit;
+    s.Inp1Shape = shape;
+    s.TrigLevel = level;
+    s.Typ1InRes = loading;
+    s.Inp1mU_Zro = 0.5f;
+    s.Inp1mU_Ful = 2.25f;
+    s.RemoteCont = 1;
+    s.UserLmtEna = 1;
+    QVERIFY2(bench.program(Kv760Driver(), s), qPrintable(bench.result));
+
+    QVERIFY2(bench.read(Kv760Driver(), SettingsSet()), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString("KV760-10 Settings Read.."));
+    QCOMPARE(bench.run.warning(), QString());
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, kv760Reading(), difference), qPrintable(difference));
+
+    const SettingsSet& back = bench.run.settings();
+    QCOMPARE(back.ModTypeSet, Kv760Type);
+    QCOMPARE(back.BussIdenti, s.BussIdenti);
+    QCOMPARE(back.FileName, s.FileName);
+    QCOMPARE(back.Inp1RngTyp, s.Inp1RngTyp);
+    QCOMPARE(back.Inp1MeUnit, s.Inp1MeUnit);
+    QCOMPARE(back.Inp1Shape, s.Inp1Shape);
+    QCOMPARE(back.Inp1mU_Zro, s.Inp1mU_Zro);
+    QCOMPARE(back.Inp1mU_Ful, s.Inp1mU_Ful);
+    QCOMPARE(back.Inp1EngZro, s.Inp1EngZro);
+    QCOMPARE(back.Inp1EngFul, s.Inp1EngFul);
+    QCOMPARE(back.Inp1EngUnt, s.Inp1EngUnt);
+    QCOMPARE(back.TrigLevel, s.TrigLevel);
+    QCOMPARE(back.TrigMode, s.TrigMode);
+    QCOMPARE(back.Typ1InRes, s.Typ1InRes);
+    QCOMPARE(back.Inp1Respon, s.Inp1Respon);
+    QCOMPARE(back.RemoteCont, s.RemoteCont);
+    QCOMPARE(back.DirecrReve, s.DirecrReve);
+    QCOMPARE(back.UserLmtEna, s.UserLmtEna);
+    QCOMPARE(back.AuxImA, s.AuxImA);
+    QCOMPARE(back.AuxVmA, s.AuxVmA);
+    QCOMPARE(back.Out1RngTyp, s.Out1RngTyp);
+    QCOMPARE(back.Out1EngZro, s.Out1EngZro);
+    QCOMPARE(back.Out1EngFul, s.Out1EngFul);
+    QCOMPARE(back.Out1SigLmZ, s.Out1SigLmZ);
+    QCOMPARE(back.Out1SigLmF, s.Out1SigLmF);
+    QCOMPARE(back.Out1EngUnt, QString("mA"));
+    QVERIFY(back.Table1 == s.Table1);
+}
+
+void TestDrv760::wrongModelStopsAtTheFirstStep() {
+    drvbench::Bench bench(4, 1);  // a KV720-20
+    QVERIFY(bench.ready());
+    DiagnosticCapture capture;
+    QVERIFY(!bench.program(Kv760Driver(), kv760Record()));
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Module Type: KV720-20 is not KV760 v1!"));
+    QCOMPARE(bench.sent.size(), size_t(1));
+    QVERIFY(capture.entries.contains("modKV760.cbSet:KV720-20 is not KV760 v1!"));
+    QVERIFY(!bench.connection.engine().reserved());
+}
+
+void TestDrv760::refusedInputStopsBeforeAnyWrite() {
+    drvbench::Bench bench(Kv760Type, 0);
+    QVERIFY(bench.ready());
+    SettingsSet s = kv760Record();
+    s.Inp1RngTyp = 8;
+    QVERIFY(!bench.program(Kv760Driver(), s));
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Module Type: Input ? Sensor ? :8"));
+    QCOMPARE(bench.sent.size(), size_t(1));
+    QCOMPARE(bench.sent[0].command, 'R');
+}
+
+void TestDrv760::outputOutOfRangeNamesTheRegister() {
+    drvbench::Bench bench(Kv760Type, 0);
+    QVERIFY(bench.ready());
+    SettingsSet s = kv760Record();
+    s.Out1EngFul = 30;  // 0-20 mA allows 21
+    QVERIFY(!bench.program(Kv760Driver(), s));
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Aux V calculated: UsrCalRangeSet: Max > 21"));
+    // Everything up to the excitation went out; the output range did not.
+    const std::vector<drvbench::Frame> all = kv760Programming();
+    const drvbench::Frame auxV{'R', 16, RegMapFor(Kv760Map).Aux_V};
+    const auto end = std::find(all.begin(), all.end(), auxV);
+    QVERIFY(end != all.end());
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, {all.begin(), end + 1}, difference),
+             qPrintable(difference));
+}
+
+void TestDrv760::flagCWritesToldApartByTheDriver() {
+    StepBench b;
+    QString text;
+    QVERIFY2(b.step(DispatchProgram, RegAdd.Mod_Type, 16, text), qPrintable(text));
+    // The first write's acknowledgement carries 16 like any other; it starts the file name.
+    QVERIFY2(b.step(DispatchProgram, RegAdd.Flag_C, 16, text), qPrintable(text));
+    QCOMPARE(b.engine.awaitedAddress(), RegAdd.File_Name);
+    QVERIFY(b.step(DispatchProgram, RegAdd.File_Name, 16, text));
+    // In the middle of the file name a Flag_C acknowledgement is neither write.
+    QVERIFY(!b.step(DispatchProgram, RegAdd.Flag_C, 16, text));
+    QCOMPARE(text, QString("PROGRAM FAIL Control Flag C:  Return ID16 Invalid"));
+}
+
+void TestDrv760::unexpectedFileNamePart() {
+    StepBench b;
+    QString text;
+    QVERIFY(b.step(DispatchProgram, RegAdd.Mod_Type, 16, text));
+    QVERIFY(b.step(DispatchProgram, RegAdd.Flag_C, 16, text));
+    QVERIFY(!b.step(DispatchProgram, RegAdd.File_Name, 36, text));
+    QCOMPARE(text, QString("PROGRAM FAIL File Name -36:  Return ID36 Invalid"));
+}
+
+void TestDrv760::addressOutsideTheOrder() {
+    StepBench b;
+    DiagnosticCapture capture;
+    QString text;
+    QVERIFY(!b.step(DispatchProgram, RegAdd.Serial_No, 16, text));
+    QCOMPARE(text, QString("PROGRAM FAIL Serial number: ? Set Address42"));
+    QVERIFY(!b.step(DispatchRead, RegAdd.Serial_No, 16, text));
+    QCOMPARE(text, QString("cbGet ? address:42"));
+    QVERIFY(capture.entries.contains("modKV760.cbGet:cbGet ? address:42"));
+}
+
+void TestDrv760::lastRegisterBelongsToTheWindow() {
+    StepBench b;
+    QString text;
+    QVERIFY(!b.step(DispatchProgram, RegAdd.Remote1, 16, text));
+    QCOMPARE(
+        text,
+        QString("PROGRAM FAIL Remote Output 1: cbSet RegAdd.Remote1 End process on calling form"));
+    QVERIFY(!b.step(DispatchProgram, 1, 16, text));
+    QVERIFY(text.endsWith(": cbSet 1 FAIL Start process on calling form"));
+}
+
+void TestDrv760::unknownDispatcherKind() {
+    StepBench b;
+    DiagnosticCapture capture;
+    QString text;
+    QVERIFY(!b.step(4, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(text, QString("GS760 ? Call Back Function"));
+    QVERIFY(capture.entries.contains("GS760:GS760 ? Call Back Function"));
+    QCOMPARE(b.engine.state(), qint32(StateRun));
 }
 
 QTEST_GUILESS_MAIN(TestDrv760)
