@@ -1,8 +1,339 @@
 #include "drivers/kv7146_flags.h"
+#include "drivers/kv7146v1_driver.h"
+#include "drivers/kv7146v2_driver.h"
+#include "drivers/step_runner.h"
+#include "engine/request_engine.h"
+#include "model/linearisation.h"
+#include "tests/support/diagnostic_capture.h"
+#include "tests/support/driver_bench.h"
 
 #include <QtTest>
 
 using namespace kv;
+using drvbench::Expect;
+using drvbench::Frame;
+
+namespace {
+
+// --- records as the settings windows hand them over ---
+
+SettingsSet kv714v1Record() {
+    SettingsSet s;
+    s.BussIdenti = 12;
+    s.Inp1RngTyp = 4;  // 4-20 mA
+    s.Inp1EngZro = 4;
+    s.Inp1EngFul = 20;
+    s.Inp1Respon = 1;
+    s.UserLmtEna = 1;
+    s.Out1RngTyp = 8;  // 1-5 V
+    s.Out1EngZro = 1;
+    s.Out1EngFul = 5;
+    s.Out1SigLmZ = 1.2f;
+    s.Out1SigLmF = 4.8f;
+    return s;
+}
+
+SettingsSet kv716v1Record() {
+    SettingsSet s = kv714v1Record();
+    s.Inp1RngTyp = 9;  // 0-10 V
+    s.Inp1EngZro = 0.5f;
+    s.Inp1EngFul = 10;
+    s.Out1RngTyp = 8;  // 0-10 V
+    s.Out1EngZro = 0;
+    s.Out1EngFul = 10;
+    s.Out1SigLmZ = 0;
+    s.Out1SigLmF = 10.3f;
+    s.Out2RngTyp = 3;  // 4-20 mA
+    s.Out2EngZro = 20;
+    s.Out2EngFul = 4;
+    s.Out2SigLmZ = 3.9f;
+    s.Out2SigLmF = 20.2f;
+    s.DirecrReve = 1;
+    s.Inp1Respon = 0;
+    return s;
+}
+
+void curveTable(SettingsSet& s) {
+    for (int i = 0; i <= Table1LastUsed; ++i)
+        s.Table1[i] = i * i;
+    TableChecksum(s.Table1.data(), Table1LastUsed);
+}
+
+SettingsSet kv714v2Record() {
+    SettingsSet s;
+    s.BussIdenti = 21;
+    s.SetFileName(QStringLiteral("TANK LEVEL 3"));
+    s.Inp1EngUnt = QStringLiteral("m   ");
+    s.Inp1EngZro = 0;
+    s.Inp1EngFul = 5.5f;
+    s.Inp1RngSet = 4;  // 4-20 mA
+    s.Inp1mU_Zro = 4;
+    s.Inp1mU_Ful = 20;
+    s.Out1RngTyp = 9;  // 0-10 V
+    s.Out1EngZro = 0;
+    s.Out1EngFul = 10;
+    s.Out1SigLmZ = 0.2f;
+    s.Out1SigLmF = 10.2f;
+    s.Inp1Respon = 1;
+    s.UserLmtEna = 1;
+    s.RemoteCont = 1;
+    s.Inp1Shape = QStringLiteral("Table");
+    curveTable(s);
+    return s;
+}
+
+SettingsSet kv716v2Record() {
+    SettingsSet s = kv714v2Record();
+    s.Inp1RngSet = 9;  // 0-10 V
+    s.Inp1mU_Zro = 0;
+    s.Inp1mU_Ful = 10;
+    s.Out1RngTyp = 2;  // 0-20 mA
+    s.Out1EngZro = 0;
+    s.Out1EngFul = 20;
+    s.Out1SigLmZ = 0;
+    s.Out1SigLmF = 20;
+    s.Out2RngTyp = 8;  // 0-10 V
+    s.Out2EngZro = 2;
+    s.Out2EngFul = 10;
+    s.Out2SigLmZ = 2;
+    s.Out2SigLmF = 9.5f;
+    s.Inp1Respon = 0;
+    s.UserLmtEna = 3;
+    s.DirecrReve = 1;
+    s.RemoteCont = 2;
+    s.Inp1Shape = QStringLiteral("Linear");
+    return s;
+}
+
+// --- the orders, row by row ---
+
+std::vector<Frame> kv714v1Programming() {
+    Expect e(1);
+    e.read("Mod_Type")
+        .write("In_Rng1")
+        .write("Usr_In1_F")
+        .write("Usr_In1_Z")
+        .write("Resp1")
+        .write("Sig_Lmt_On")
+        .write("Out_Rng1")
+        .write("Usr_Out1_F")
+        .write("Usr_Out1_Z")
+        .write("Sig_Lmt1_F")
+        .write("Sig_Lmt1_Z")
+        .write("Buss_ID");
+    return e.frames();
+}
+
+std::vector<Frame> kv716v1Programming() {
+    Expect e(2);
+    e.read("Mod_Type")
+        .write("In_Rng1")
+        .write("Usr_In1_F")
+        .write("Usr_In1_Z")
+        .write("Resp1")
+        .write("Sig_Lmt_On")
+        .write("Out_Rng2")
+        .write("Usr_Out2_F")
+        .write("Usr_Out2_Z")
+        .write("Sig_Lmt2_F")
+        .write("Sig_Lmt2_Z")
+        .write("Out_Rng1")
+        .write("Usr_Out1_F")
+        .write("Usr_Out1_Z")
+        .write("Sig_Lmt1_F")
+        .write("Sig_Lmt1_Z")
+        .write("IO_Dir")
+        .write("Buss_ID");
+    return e.frames();
+}
+
+std::vector<Frame> kv714v1Reading() {
+    Expect e(1);
+    e.read("Mod_Type")
+        .read("Buss_ID")
+        .read("Sig_Lmt_On")
+        .read("In_Rng1")
+        .read("Out_Rng1")
+        .read("Int_Temp");
+    return e.frames();
+}
+
+std::vector<Frame> kv716v1Reading() {
+    Expect e(2);
+    e.read("Mod_Type")
+        .read("Buss_ID")
+        .read("Sig_Lmt_On")
+        .read("IO_Dir")
+        .read("In_Rng1")
+        .read("Out_Rng2")
+        .read("Out_Rng1")
+        .read("Int_Temp");
+    return e.frames();
+}
+
+std::vector<Frame> v2Programming(int map, bool kv716) {
+    Expect e(map);
+    e.read("Mod_Type")
+        .fileName()
+        .write("Eng_Unit1")
+        .write("Eng_Unit2")
+        .write("Eng_Unit3")
+        .write("Eng_Unit4")
+        .write("Eng_In_Z")
+        .write("Eng_In_F")
+        .write("Meas_Unit_Z")
+        .write("Meas_Unit_F")
+        .write("In_Rng1")
+        .write("Usr_In1_Z")
+        .write("Usr_In1_F")
+        .write("Out_Rng1")
+        .write("Usr_Out1_Z")
+        .write("Usr_Out1_F")
+        .write("Sig_Lmt1_Z")
+        .write("Sig_Lmt1_F");
+    if (kv716)
+        e.write("Out_Rng2")
+            .write("Usr_Out2_Z")
+            .write("Usr_Out2_F")
+            .write("Sig_Lmt2_Z")
+            .write("Sig_Lmt2_F");
+    e.write("Flag_A").table1().read("Input_B4_Table").write("Buss_ID");
+    return e.frames();
+}
+
+std::vector<Frame> kv714v2Programming() {
+    return v2Programming(4, false);
+}
+std::vector<Frame> kv716v2Programming() {
+    return v2Programming(5, true);
+}
+
+std::vector<Frame> v2Reading(int map, bool kv716) {
+    Expect e(map);
+    e.read("Mod_Type")
+        .read("Buss_ID")
+        .fileName(true)
+        .read("TypInput")
+        .read("Meas_Unit_Z")
+        .read("Meas_Unit_F")
+        .read("Eng_In_F")
+        .read("Eng_In_Z")
+        .read("Flag_A")
+        .read("Out_Rng1")
+        .read("Usr_Out1_Z")
+        .read("Usr_Out1_F")
+        .read("Sig_Lmt1_Z")
+        .read("Sig_Lmt1_F")
+        .read("Eng_Unit1")
+        .read("Eng_Unit2")
+        .read("Eng_Unit3")
+        .read("Eng_Unit4")
+        .read("Usr_In1_Z")
+        .read("Usr_In1_F");
+    if (kv716)
+        e.read("Out_Rng2")
+            .read("Usr_Out2_Z")
+            .read("Usr_Out2_F")
+            .read("Sig_Lmt2_Z")
+            .read("Sig_Lmt2_F");
+    e.read("In_Rng1").table1(true).read("Input_B4_Table").read("Int_Temp");
+    return e.frames();
+}
+
+std::vector<Frame> kv714v2Reading() {
+    return v2Reading(4, false);
+}
+std::vector<Frame> kv716v2Reading() {
+    return v2Reading(5, true);
+}
+
+// One model on the simulator: the module, its driver, a record, its orders.
+struct ModelCase {
+    const char* name;
+    int typeCode;
+    int subType;
+    const DriverDescriptor& (*driver)();
+    SettingsSet (*record)();
+    std::vector<Frame> (*programming)();
+    std::vector<Frame> (*reading)();
+    const char* programmed;
+    const char* readText;
+};
+
+const ModelCase modelCases[] = {
+    {"KV714 v1", 1, 0, Kv714v1Driver, kv714v1Record, kv714v1Programming, kv714v1Reading,
+     "KV714 Programmed", "KV714-20 Settings Read.."},
+    {"KV716 v1", 3, 0, Kv716v1Driver, kv716v1Record, kv716v1Programming, kv716v1Reading,
+     "KV716 Programmed", "KV716-20 Settings Read.."},
+    {"KV714 v2", 7, 0, Kv714v2Driver, kv714v2Record, kv714v2Programming, kv714v2Reading,
+     "KV714/8 Programmed", "KV714-22 Settings Read.."},
+    {"KV718-10 as KV714 v2", 7, 3, Kv714v2Driver, kv714v2Record, kv714v2Programming, kv714v2Reading,
+     "KV714/8 Programmed", "KV718-10 Settings Read.."},
+    {"KV716 v2", 8, 0, Kv716v2Driver, kv716v2Record, kv716v2Programming, kv716v2Reading,
+     "KV716 Programmed", "KV716-22 Settings Read.."},
+};
+
+// Fields every reading run gives back, and those of each version and model.
+void compareCommon(const SettingsSet& back, const SettingsSet& s) {
+    QCOMPARE(back.BussIdenti, s.BussIdenti);
+    QCOMPARE(back.Inp1Respon, s.Inp1Respon);
+    QCOMPARE(back.UserLmtEna, s.UserLmtEna);
+    QCOMPARE(back.Out1RngTyp, s.Out1RngTyp);
+    QCOMPARE(back.Out1EngZro, s.Out1EngZro);
+    QCOMPARE(back.Out1EngFul, s.Out1EngFul);
+    QCOMPARE(back.Out1SigLmZ, s.Out1SigLmZ);
+    QCOMPARE(back.Out1SigLmF, s.Out1SigLmF);
+}
+
+void compareOutput2(const SettingsSet& back, const SettingsSet& s) {
+    QCOMPARE(back.DirecrReve, s.DirecrReve);
+    QCOMPARE(back.Out2RngTyp, s.Out2RngTyp);
+    QCOMPARE(back.Out2EngZro, s.Out2EngZro);
+    QCOMPARE(back.Out2EngFul, s.Out2EngFul);
+    QCOMPARE(back.Out2SigLmZ, s.Out2SigLmZ);
+    QCOMPARE(back.Out2SigLmF, s.Out2SigLmF);
+}
+
+void compareVersion1(const SettingsSet& back, const SettingsSet& s) {
+    QCOMPARE(back.Inp1RngTyp, s.Inp1RngTyp);
+    QCOMPARE(back.Inp1EngZro, s.Inp1EngZro);
+    QCOMPARE(back.Inp1EngFul, s.Inp1EngFul);
+}
+
+void compareVersion2(const SettingsSet& back, const SettingsSet& s) {
+    QCOMPARE(back.FileName, s.FileName);
+    QCOMPARE(back.Inp1RngSet, s.Inp1RngSet);
+    QCOMPARE(back.Inp1mU_Zro, s.Inp1mU_Zro);
+    QCOMPARE(back.Inp1mU_Ful, s.Inp1mU_Ful);
+    QCOMPARE(back.Inp1EngZro, s.Inp1EngZro);
+    QCOMPARE(back.Inp1EngFul, s.Inp1EngFul);
+    QCOMPARE(back.Inp1EngUnt, s.Inp1EngUnt);
+    QCOMPARE(back.Inp1Shape, s.Inp1Shape);
+    QCOMPARE(back.DirecrReve, s.DirecrReve);
+    QCOMPARE(back.RemoteCont, s.RemoteCont);
+    QVERIFY(back.Table1 == s.Table1);
+}
+
+// A map and an idle engine, for single steps without a module.
+struct StepBench {
+    RequestEngine engine;
+    QString requester = QStringLiteral("MCT00009");
+    SettingsSet settings;
+    StepBench(int map, qint32 typeCode, SettingsSet record) : settings(record) {
+        SetRegMap(RegAdd, map);
+        RegVal.Mod_Type = typeCode;
+        engine.setState(StateRun);
+    }
+    using Dispatcher = bool (*)(RequestEngine&, qint16, QString&, SettingsSet&, qint32, qint16,
+                                QString&);
+    bool step(Dispatcher gs, qint16 kind, qint32 id, qint16 busId, QString& text) {
+        const bool queued = gs(engine, kind, requester, settings, id, busId, text);
+        engine.setState(StateRun);
+        return queued;
+    }
+};
+
+}  // namespace
 
 class TestDrv7146 : public QObject {
     Q_OBJECT
@@ -11,6 +342,20 @@ private slots:
     void flagWord();
     void flagWordReadsBack_data();
     void flagWordReadsBack();
+
+    void programmingRunFollowsTheOrder_data();
+    void programmingRunFollowsTheOrder();
+    void programThenReadGivesTheRecord_data();
+    void programThenReadGivesTheRecord();
+    void kv716RemoteOfOutput2Only();
+    void windowRefusesAnotherFamily();
+    void dispatcherChecksItsModel();
+    void inputOutOfRange_data();
+    void inputOutOfRange();
+    void unexpectedFileNamePart();
+    void addressOutsideTheOrder();
+    void lastRegisterBelongsToTheWindow();
+    void unknownDispatcherKind();
 };
 
 void TestDrv7146::flagWord_data() {
@@ -70,6 +415,148 @@ void TestDrv7146::flagWordReadsBack() {
     QTEST(s.DirecrReve, "reverse");
     QTEST(s.RemoteCont, "remote");
     QTEST(s.Inp1Shape, "shape");
+}
+
+void TestDrv7146::programmingRunFollowsTheOrder_data() {
+    QTest::addColumn<int>("model");
+    for (int i = 0; i < int(std::size(modelCases)); ++i)
+        QTest::newRow(modelCases[i].name) << i;
+}
+
+void TestDrv7146::programmingRunFollowsTheOrder() {
+    QFETCH(int, model);
+    const ModelCase& m = modelCases[model];
+    drvbench::Bench bench(m.typeCode, m.subType);
+    QVERIFY(bench.ready());
+    QVERIFY2(bench.program(m.driver(), m.record()), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString(m.programmed));
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, m.programming(), difference), qPrintable(difference));
+    QCOMPARE(bench.sim->registerValue(RegAdd.Buss_ID), m.record().BussIdenti);
+}
+
+void TestDrv7146::programThenReadGivesTheRecord_data() {
+    programmingRunFollowsTheOrder_data();
+}
+
+void TestDrv7146::programThenReadGivesTheRecord() {
+    QFETCH(int, model);
+    const ModelCase& m = modelCases[model];
+    drvbench::Bench bench(m.typeCode, m.subType);
+    QVERIFY(bench.ready());
+    const SettingsSet s = m.record();
+    QVERIFY2(bench.program(m.driver(), s), qPrintable(bench.result));
+    QVERIFY2(bench.read(m.driver(), SettingsSet()), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString(m.readText));
+    QCOMPARE(bench.run.warning(), QString());
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, m.reading(), difference), qPrintable(difference));
+
+    const SettingsSet& back = bench.run.settings();
+    QCOMPARE(back.ModTypeSet, m.typeCode);
+    compareCommon(back, s);
+    const int family = m.driver().family;
+    if (family == KV714v1 || family == KV716v1)
+        compareVersion1(back, s);
+    else
+        compareVersion2(back, s);
+    if (family == KV716v1 || family == KV716v2)
+        compareOutput2(back, s);
+}
+
+void TestDrv7146::kv716RemoteOfOutput2Only() {
+    drvbench::Bench bench(8, 1);
+    QVERIFY(bench.ready());
+    SettingsSet s = kv716v2Record();
+    s.UserLmtEna = 0;
+    s.DirecrReve = 0;
+    QVERIFY2(bench.program(Kv716v2Driver(), s), qPrintable(bench.result));
+    QCOMPARE(bench.sim->registerValue(RegAdd.Flag_A), 0x02);
+}
+
+void TestDrv7146::windowRefusesAnotherFamily() {
+    drvbench::Bench bench(4, 1);  // a KV720 on the KV714/KV716 windows
+    QVERIFY(bench.ready());
+    QVERIFY(!bench.program(Kv714v1Driver(), kv714v1Record()));
+    QCOMPARE(bench.result, QString("f_KV714 Unknown memory map"));
+    QVERIFY(!bench.read(Kv716v2Driver(), SettingsSet()));
+    QCOMPARE(bench.result, QString("f_KV7146v2.cbGet Incorecct memory map"));
+    QCOMPARE(bench.sent.size(), size_t(1));
+}
+
+void TestDrv7146::dispatcherChecksItsModel() {
+    StepBench b(2, 1, kv716v1Record());  // a KV714-20 answering a KV716 run
+    QString text;
+    QVERIFY(!b.step(GS716v1, DispatchProgram, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(text, QString("PROGRAM FAIL Module Type: KV714-20 is not KV716!"));
+    StepBench v2(4, 8, kv714v2Record());
+    RegVal.TypInput = 0;
+    QVERIFY(!v2.step(GS714v2, DispatchRead, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(text, QString("KV716-22 is not KV714 v2!"));
+}
+
+void TestDrv7146::inputOutOfRange_data() {
+    QTest::addColumn<int>("model");
+    QTest::addColumn<QString>("message");
+    QTest::newRow("KV714 v1") << 0 << "PROGRAM FAIL Module Type: UsrCalRangeSet: Max > 21";
+    QTest::newRow("KV714 v2") << 2 << "PROGRAM FAIL D Measure Unit FS 1: UsrCalRangeSet: Max > 21";
+}
+
+void TestDrv7146::inputOutOfRange() {
+    QFETCH(int, model);
+    const ModelCase& m = modelCases[model];
+    drvbench::Bench bench(m.typeCode, m.subType);
+    QVERIFY(bench.ready());
+    SettingsSet s = m.record();
+    s.Inp1EngFul = 21.5f;  // beyond 4-20 mA in the first version
+    s.Inp1mU_Ful = 21.5f;  // and in the second
+    QVERIFY(!bench.program(m.driver(), s));
+    QTEST(bench.result, "message");
+    // Nothing past the failing step went out: the input range was never written.
+    const Frame inRange{'W', 16, RegAdd.In_Rng1};
+    QVERIFY(std::find(bench.sent.begin(), bench.sent.end(), inRange) == bench.sent.end());
+}
+
+void TestDrv7146::unexpectedFileNamePart() {
+    StepBench b(4, 7, kv714v2Record());
+    QString text;
+    QVERIFY(b.step(GS714v2, DispatchProgram, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(b.engine.awaitedAddress(), RegAdd.File_Name);
+    QVERIFY(b.step(GS714v2, DispatchProgram, RegAdd.File_Name, 16, text));
+    QVERIFY(!b.step(GS714v2, DispatchProgram, RegAdd.File_Name, 36, text));
+    QCOMPARE(text, QString("PROGRAM FAIL File Name -36:  Return ID36 Invalid"));
+}
+
+void TestDrv7146::addressOutsideTheOrder() {
+    StepBench b(1, 1, kv714v1Record());
+    DiagnosticCapture capture;
+    QString text;
+    QVERIFY(!b.step(GS714v1, DispatchProgram, RegAdd.Serial_No, 16, text));
+    QCOMPARE(text, QString("PROGRAM FAIL Serial number: ? Set Address76"));
+    QVERIFY(capture.entries.contains("modKV7146v1.cbSet:? Set Address76"));
+    QVERIFY(!b.step(GS714v1, DispatchRead, RegAdd.Serial_No, 16, text));
+    QCOMPARE(text, QString("cbGet ? address:76"));
+    QVERIFY(capture.entries.contains("GS7146v1.cbGet:cbGet ? address:76"));
+}
+
+void TestDrv7146::lastRegisterBelongsToTheWindow() {
+    StepBench b(5, 8, kv716v2Record());
+    QString text;
+    QVERIFY(!b.step(GS716v2, DispatchProgram, RegAdd.Buss_ID, 16, text));
+    QCOMPARE(text,
+             QString("PROGRAM FAIL BUSS ID: cbSet RegAdd.Buss_ID End process on calling form"));
+    // While reading, the bus ID is an ordinary step.
+    QVERIFY2(b.step(GS716v2, DispatchRead, RegAdd.Buss_ID, 16, text), qPrintable(text));
+    QCOMPARE(b.engine.awaitedAddress(), RegAdd.File_Name);
+}
+
+void TestDrv7146::unknownDispatcherKind() {
+    StepBench b(2, 3, kv716v1Record());
+    QString text;
+    QVERIFY(!b.step(GS716v1, 4, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(text, QString("GS716v1 ? Call Back Function"));
+    QVERIFY(!b.step(GS714v2, 0, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(text, QString("GS714v2 ? Call Back Function"));
 }
 
 QTEST_GUILESS_MAIN(TestDrv7146)
