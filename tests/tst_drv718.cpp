@@ -1,5 +1,11 @@
+#include "drivers/kv718_driver.h"
 #include "drivers/kv718_input.h"
+#include "drivers/step_runner.h"
+#include "engine/request_engine.h"
 #include "model/codec.h"
+#include "model/linearisation.h"
+#include "tests/support/diagnostic_capture.h"
+#include "tests/support/driver_bench.h"
 
 #include <QtTest>
 
@@ -40,6 +46,120 @@ SettingsSet record(const QString& unit, qint32 range, float lo, float hi) {
     return s;
 }
 
+constexpr int Kv718Type = 10;
+constexpr int Kv718Map = 7;
+
+// A record as the KV718-xA window hands it over, its input range chosen by the check.
+SettingsSet kv718Record(const QString& unit, float lo, float hi) {
+    SettingsSet s;
+    s.ModTypeSet = Kv718Type;
+    s.BussIdenti = 33;
+    s.SetFileName(QStringLiteral("MOTOR VOLTS"));
+    s.Inp1MeUnit = unit;
+    s.Inp1mU_Zro = lo;
+    s.Inp1mU_Ful = hi;
+    QString message;
+    if (!KV718InputRangeCheck(QString::number(lo), QString::number(hi), unit, s.Inp1RngSet,
+                              message))
+        qWarning() << message;
+    s.Inp1EngZro = -100;
+    s.Inp1EngFul = 100;
+    s.Inp1EngUnt = QStringLiteral("%   ");
+    s.Inp1Samples = 100;
+    s.Inp1Shape = QStringLiteral("Linear");
+    s.Out1RngTyp = 4;  // 4-20 mA
+    s.Out1EngZro = 4;
+    s.Out1EngFul = 20;
+    s.Out1SigLmZ = 3.8f;
+    s.Out1SigLmF = 20.5f;
+    s.Inp1Respon = 1;
+    s.DirecrReve = 1;
+    for (int i = 0; i <= Table1LastUsed; ++i)
+        s.Table1[i] = i * i;
+    TableChecksum(s.Table1.data(), Table1LastUsed);
+    return s;
+}
+
+std::vector<drvbench::Frame> kv718Programming() {
+    drvbench::Expect e(Kv718Map);
+    e.read("Mod_Type")
+        .fileName()
+        .write("Eng_Unit1")
+        .write("Eng_Unit2")
+        .write("Eng_Unit3")
+        .write("Eng_Unit4")
+        .write("Eng_In_Z")
+        .write("Eng_In_F")
+        .write("Meas_Unit_Z")
+        .write("Meas_Unit_F")
+        .write("In_Rng1")
+        .write("Usr_In1_Z")
+        .write("Usr_In1_F")
+        .write("Out_Rng1")
+        .write("Usr_Out1_Z")
+        .write("Usr_Out1_F")
+        .write("Sig_Lmt1_Z")
+        .write("Sig_Lmt1_F")
+        .write("ST_Samples")
+        .write("MIZ")
+        .write("Flag_A")
+        .table1()
+        .read("Input_B4_Table")
+        .write("Buss_ID");
+    return e.frames();
+}
+
+std::vector<drvbench::Frame> kv718Reading() {
+    drvbench::Expect e(Kv718Map);
+    e.read("Mod_Type")
+        .read("Buss_ID")
+        .fileName(true)
+        .read("TypInput")
+        .read("Meas_Unit_Z")
+        .read("Meas_Unit_F")
+        .read("Eng_In_F")
+        .read("Eng_In_Z")
+        .read("Flag_A")
+        .read("Out_Rng1")
+        .read("Usr_Out1_Z")
+        .read("Usr_Out1_F")
+        .read("Sig_Lmt1_Z")
+        .read("Sig_Lmt1_F")
+        .read("ST_Samples")
+        .read("MIZ")
+        .read("Eng_Unit1")
+        .read("Eng_Unit2")
+        .read("Eng_Unit3")
+        .read("Eng_Unit4")
+        .read("Usr_In1_Z")
+        .read("Usr_In1_F")
+        .read("In_Rng1")
+        .table1(true)
+        .read("Input_B4_Table")
+        .read("Int_Temp");
+    return e.frames();
+}
+
+// A KV718-xA map and an idle engine, for single steps without a module.
+struct StepBench {
+    RequestEngine engine;
+    QString requester = QStringLiteral("MCT00011");
+    SettingsSet settings = kv718Record(QStringLiteral("V"), -10, 10);
+    StepBench() {
+        SetRegMap(RegAdd, Kv718Map);
+        RegVal.Mod_Type = Kv718Type;
+        RangeTable& input = ProgramRangeTable(Input1);
+        input[settings.Inp1RngSet].countMin = 32768;
+        input[settings.Inp1RngSet].countMax = 60000;
+        engine.setState(StateRun);
+    }
+    bool step(qint16 kind, qint32 id, qint16 busId, QString& text) {
+        const bool queued = GS718vA(engine, kind, requester, settings, id, busId, text);
+        engine.setState(StateRun);
+        return queued;
+    }
+};
+
 }  // namespace
 
 class TestDrv718 : public QObject {
@@ -58,6 +178,18 @@ private slots:
     void inputCalibrationFailures();
     void sampleTime_data();
     void sampleTime();
+
+    void programmingRunFollowsTheOrder_data();
+    void programmingRunFollowsTheOrder();
+    void programThenReadGivesTheRecord_data();
+    void programThenReadGivesTheRecord();
+    void wrongModelStopsAtTheFirstStep();
+    void inputCalibrationFailureStopsBeforeAnyWrite_data();
+    void inputCalibrationFailureStopsBeforeAnyWrite();
+    void unexpectedFileNamePart();
+    void addressOutsideTheOrder();
+    void lastRegisterBelongsToTheWindow();
+    void unknownDispatcherKind();
 };
 
 void TestDrv718::rangeCheck_data() {
@@ -327,6 +459,181 @@ void TestDrv718::sampleTime() {
     QVERIFY(KV718A_CaculateInCal(s, inputTable(), values, message));
     QTEST(int(values.ST_Samples), "samples");
     QCOMPARE(int(KV718SamplesMs(values.ST_Samples)), ms);
+}
+
+void TestDrv718::programmingRunFollowsTheOrder_data() {
+    QTest::addColumn<QString>("unit");
+    QTest::addColumn<float>("lo");
+    QTest::addColumn<float>("hi");
+    QTest::addColumn<int>("range");
+    QTest::newRow("-10..10 V") << "V" << -10.0f << 10.0f << 10;
+    QTest::newRow("0..100 Vac") << "Vac" << 0.0f << 100.0f << 15;
+}
+
+void TestDrv718::programmingRunFollowsTheOrder() {
+    QFETCH(QString, unit);
+    QFETCH(float, lo);
+    QFETCH(float, hi);
+    QFETCH(int, range);
+    drvbench::Bench bench(Kv718Type, 3);
+    QVERIFY(bench.ready());
+    const SettingsSet s = kv718Record(unit, lo, hi);
+    QCOMPARE(s.Inp1RngSet, range);
+    QVERIFY2(bench.program(Kv718Driver(), s), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString("KV718-xA Programmed"));
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, kv718Programming(), difference),
+             qPrintable(difference));
+
+    // The input counts span the module's own calibration of the chosen range:
+    // -10..10 V the whole bipolar row, 0..100 Vac half of 0..200 V from its minimum.
+    const RegMap map = RegMapFor(Kv718Map);
+    const int rangeRegister = 2 * (range + 7);  // even register of the pair
+    const qint32 cl = bench.sim->registerValue(rangeRegister);
+    const qint32 ch = bench.sim->registerValue(rangeRegister + 1);
+    const qint32 zero = bench.sim->registerValue(map.Usr_In1_Z);
+    const qint32 full = bench.sim->registerValue(map.Usr_In1_F);
+    if (unit == QLatin1String("V")) {
+        QVERIFY2(qAbs(zero - (2 * cl - ch)) <= 1, qPrintable(QString::number(zero)));
+        QVERIFY2(qAbs(full - ch) <= 1, qPrintable(QString::number(full)));
+        QCOMPARE(bench.sim->registerValue(map.Flag_A), 0xA0);  // response, reverse, DC volts
+    } else {
+        QCOMPARE(zero, cl);
+        QVERIFY2(qAbs(full - (ch - cl) / 2) <= 1, qPrintable(QString::number(full)));
+        QCOMPARE(bench.sim->registerValue(map.MIZ), 0);
+        QCOMPARE(bench.sim->registerValue(map.Flag_A), 0xA6);  // response, reverse, AC volts
+    }
+    QCOMPARE(bench.sim->registerValue(map.ST_Samples), 11);  // 100 ms
+    QCOMPARE(bench.sim->registerValue(map.In_Rng1), range);
+}
+
+void TestDrv718::programThenReadGivesTheRecord_data() {
+    QTest::addColumn<QString>("unit");
+    QTest::addColumn<float>("lo");
+    QTest::addColumn<float>("hi");
+    QTest::addColumn<QString>("shape");
+    QTest::addColumn<int>("samples");
+    QTest::newRow("V linear") << "V" << -2.5f << 7.5f << "Linear" << 50;
+    QTest::newRow("Vac table") << "Vac" << 1.0f << 100.0f << "Table" << 4000;
+}
+
+void TestDrv718::programThenReadGivesTheRecord() {
+    QFETCH(QString, unit);
+    QFETCH(float, lo);
+    QFETCH(float, hi);
+    QFETCH(QString, shape);
+    QFETCH(int, samples);
+    drvbench::Bench bench(Kv718Type, 1);
+    QVERIFY(bench.ready());
+    SettingsSet s = kv718Record(unit, lo, hi);
+    s.Inp1Shape = shape;
+    s.Inp1Samples = samples;
+    s.RemoteCont = 1;
+    s.UserLmtEna = 1;
+    s.Inp1Respon = 0;
+    QVERIFY2(bench.program(Kv718Driver(), s), qPrintable(bench.result));
+    QVERIFY2(bench.read(Kv718Driver(), SettingsSet()), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString("KV718-2A Settings Read.."));
+    QCOMPARE(bench.run.warning(), QString());
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, kv718Reading(), difference), qPrintable(difference));
+
+    const SettingsSet& back = bench.run.settings();
+    QCOMPARE(back.ModTypeSet, Kv718Type);
+    QCOMPARE(back.BussIdenti, s.BussIdenti);
+    QCOMPARE(back.FileName, s.FileName);
+    QCOMPARE(back.Inp1MeUnit, s.Inp1MeUnit);
+    QCOMPARE(back.Inp1RngSet, s.Inp1RngSet);
+    QCOMPARE(back.Inp1mU_Zro, s.Inp1mU_Zro);
+    QCOMPARE(back.Inp1mU_Ful, s.Inp1mU_Ful);
+    QCOMPARE(back.Inp1EngZro, s.Inp1EngZro);
+    QCOMPARE(back.Inp1EngFul, s.Inp1EngFul);
+    QCOMPARE(back.Inp1EngUnt, s.Inp1EngUnt);
+    QCOMPARE(back.Inp1Shape, s.Inp1Shape);
+    QCOMPARE(back.Inp1Samples, s.Inp1Samples);
+    QCOMPARE(back.Inp1Respon, s.Inp1Respon);
+    QCOMPARE(back.UserLmtEna, s.UserLmtEna);
+    QCOMPARE(back.DirecrReve, s.DirecrReve);
+    QCOMPARE(back.RemoteCont, s.RemoteCont);
+    QCOMPARE(back.Out1RngTyp, s.Out1RngTyp);
+    QCOMPARE(back.Out1EngZro, s.Out1EngZro);
+    QCOMPARE(back.Out1EngFul, s.Out1EngFul);
+    QCOMPARE(back.Out1SigLmZ, s.Out1SigLmZ);
+    QCOMPARE(back.Out1SigLmF, s.Out1SigLmF);
+    QVERIFY(back.Table1 == s.Table1);
+}
+
+void TestDrv718::wrongModelStopsAtTheFirstStep() {
+    drvbench::Bench bench(7, 0);  // a KV714-22
+    QVERIFY(bench.ready());
+    DiagnosticCapture capture;
+    QVERIFY(!bench.program(Kv718Driver(), kv718Record(QStringLiteral("V"), 0, 10)));
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Module Type: KV714-22 is not KV718-xA!"));
+    QCOMPARE(bench.sent.size(), size_t(1));
+    QVERIFY(capture.entries.contains("modKV718vA.cbSet:KV714-22 is not KV718-xA!"));
+    QVERIFY(capture.entries.contains(
+        "f_KV718vA.cbSet:PROGRAM FAIL Module Type: KV714-22 is not KV718-xA!"));
+}
+
+void TestDrv718::inputCalibrationFailureStopsBeforeAnyWrite_data() {
+    QTest::addColumn<QString>("unit");
+    QTest::addColumn<int>("range");
+    QTest::addColumn<QString>("message");
+    QTest::newRow("no such row") << "V" << 17
+                                 << "PROGRAM FAIL Module Type: KV718A_CaculateInCal: Invalid "
+                                    "Input 1 Range";
+    // The KV718-xA reports no calibration for the current rows 1-5.
+    QTest::newRow("row not calibrated") << "mA" << 3
+                                        << "PROGRAM FAIL Module Type: KV718A_CaculateInCal: "
+                                           "Update Calibration Values";
+}
+
+void TestDrv718::inputCalibrationFailureStopsBeforeAnyWrite() {
+    QFETCH(QString, unit);
+    QFETCH(int, range);
+    drvbench::Bench bench(Kv718Type, 3);
+    QVERIFY(bench.ready());
+    SettingsSet s = kv718Record(unit, 0, 10);
+    s.Inp1RngSet = range;
+    QVERIFY(!bench.program(Kv718Driver(), s));
+    QTEST(bench.result, "message");
+    QCOMPARE(bench.sent.size(), size_t(1));
+}
+
+void TestDrv718::unexpectedFileNamePart() {
+    StepBench b;
+    QString text;
+    QVERIFY2(b.step(DispatchProgram, RegAdd.Mod_Type, 16, text), qPrintable(text));
+    QVERIFY(b.step(DispatchProgram, RegAdd.File_Name, 16, text));
+    QVERIFY(b.step(DispatchProgram, RegAdd.File_Name, 20, text));
+    QVERIFY(!b.step(DispatchProgram, RegAdd.File_Name, 36, text));
+    QCOMPARE(text, QString("PROGRAM FAIL File Name -36:  Return ID36 Invalid"));
+}
+
+void TestDrv718::addressOutsideTheOrder() {
+    StepBench b;
+    DiagnosticCapture capture;
+    QString text;
+    QVERIFY(!b.step(DispatchProgram, RegAdd.Serial_No, 16, text));
+    QCOMPARE(text, QString("PROGRAM FAIL Serial number: ? Set Address76"));
+    QVERIFY(!b.step(DispatchRead, RegAdd.Serial_No, 16, text));
+    QCOMPARE(text, QString("cbGet ? address:76"));
+    QVERIFY(capture.entries.contains("GS718vA.cbGet:cbGet ? address:76"));
+}
+
+void TestDrv718::lastRegisterBelongsToTheWindow() {
+    StepBench b;
+    QString text;
+    QVERIFY(!b.step(DispatchProgram, RegAdd.Buss_ID, 16, text));
+    QCOMPARE(text,
+             QString("PROGRAM FAIL BUSS ID: cbSet RegAdd.Buss_ID End process on calling form"));
+}
+
+void TestDrv718::unknownDispatcherKind() {
+    StepBench b;
+    QString text;
+    QVERIFY(!b.step(5, RegAdd.Mod_Type, 16, text));
+    QCOMPARE(text, QString("GS718vA ? Call Back Function"));
 }
 
 QTEST_GUILESS_MAIN(TestDrv718)
