@@ -60,6 +60,13 @@ AckKind ackKindFor(RequestKind kind) {
     }
 }
 
+DriverDescriptor Kv720Like(int family, const char* window) {
+    DriverDescriptor driver = *AllDrivers().begin()[0];
+    driver.family = family;
+    driver.run.window = window;
+    return driver;
+}
+
 }  // namespace
 
 class TestDriverTables : public QObject {
@@ -74,6 +81,7 @@ private slots:
     void valuesMatchTheRegisterWidth();
     void multiPartRegistersUseTheirTransfers();
     void driverListIsConsistent();
+    void windowPicksItsDriverByMap();
 };
 
 void TestDriverTables::everyRegisterExistsInTheFamilyMap() {
@@ -228,6 +236,19 @@ void TestDriverTables::driverListIsConsistent() {
     }
     QCOMPARE(DriverForMap(NoModuleMap), nullptr);
     QCOMPARE(DriverForMap(UnknownModuleMap), nullptr);
+}
+
+void TestDriverTables::windowPicksItsDriverByMap() {
+    // Two drivers behind one window, and a third window with a single driver.
+    DriverDescriptor first = Kv720Like(1, "frmPair");
+    DriverDescriptor second = Kv720Like(2, "frmPair");
+    DriverDescriptor single = Kv720Like(6, "frmSingle");
+    const DriverDescriptor* const list[] = {&first, &second, &single};
+    const DriverList drivers{list, 3};
+    QCOMPARE(WindowDriverForMap(drivers, first, 2), &second);
+    QCOMPARE(WindowDriverForMap(drivers, second, 1), &first);
+    QCOMPARE(WindowDriverForMap(drivers, first, 6), nullptr);   // the window's unknown map text
+    QCOMPARE(WindowDriverForMap(drivers, single, 1), &single);  // its model check speaks
 }
 
 QTEST_GUILESS_MAIN(TestDriverTables)

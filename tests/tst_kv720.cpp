@@ -90,6 +90,7 @@ private slots:
     void inputCounts();
     void shapeAndUnitCodes_data();
     void shapeAndUnitCodes();
+    void inputTypeNames();
 
     void dispatcherKinds();
     void addressesOutsideTheOrder();
@@ -429,6 +430,13 @@ void TestKv720::shapeAndUnitCodes() {
     QTEST(Kv720UnitText(type, Kv720UnitCode(typeInUnit)), "unit");
     QTEST(Kv720ShapeText(type, Kv720ShapeCode(typeInUnit)), "shape");
     QCOMPARE(Kv720TypeInUnit(Kv720UnitCode(typeInUnit), Kv720ShapeCode(typeInUnit)), typeInUnit);
+}
+
+void TestKv720::inputTypeNames() {
+    QCOMPARE(Kv720InputTypeText(Kv720MilliVolt), QString("mV Transmitter"));
+    QCOMPARE(Kv720InputTypeText(Kv720Rtd2Wire), QString("RTDT 2W Transmitter"));
+    QCOMPARE(Kv720InputTypeText(Kv720StrainGauge), QString("Strain Gauge Transmitter"));
+    QCOMPARE(Kv720InputTypeText(9), QString());
 }
 
 void TestKv720::dispatcherKinds() {
