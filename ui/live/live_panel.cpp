@@ -148,6 +148,9 @@ QFrame* LivePanel::buildInput() {
     w.labInputValue = valueLabel(w.picInput);
     w.labInputError = errorLabel(w.picInput);
     w.labCusValInput = summaryLabel(w.picInput);
+    w.labInputValue->setObjectName(QStringLiteral("labInputValue"));
+    w.labInputError->setObjectName(QStringLiteral("labInputError"));
+    w.labCusValInput->setObjectName(QStringLiteral("labCusValInput"));
 
     auto* layout = new QVBoxLayout(w.picInput);
     layout->addLayout(headingRow(w.labInput, {w.labResponce1, w.inLo, w.inHi}));
@@ -168,6 +171,9 @@ QFrame* LivePanel::buildOutput(int channel) {
     w.labOutputValue = valueLabel(w.picOutput);
     w.labOutputError = errorLabel(w.picOutput);
     w.labCusValOutput = summaryLabel(w.picOutput);
+    w.labOutputValue->setObjectName(QStringLiteral("labOutputValue%1").arg(channel));
+    w.labOutputError->setObjectName(QStringLiteral("labOutputError%1").arg(channel));
+    w.labCusValOutput->setObjectName(QStringLiteral("labCusValOutput%1").arg(channel));
 
     w.remoteRow = new QWidget(w.picOutput);
     // The card keeps its height when the output goes in or out of remote control.
