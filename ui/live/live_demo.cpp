@@ -1,7 +1,8 @@
 // Shows the live panel filled as a connected module would fill it: a KV720
 // with a millivolt input, a two-output KV716 or no module. With --shot the
 // panel is saved as a picture instead of shown.
-//   live_demo [--family 720|716|760|0] [--remote] [--theme 0|1] [--size WxH] [--shot file.png]
+//   live_demo [--family 720|716|760|0] [--remote] [--reading N] [--entry TEXT]
+//             [--theme 0|1] [--size WxH] [--shot file.png]
 
 #include "engine/module_connection.h"
 #include "model/module_ranges.h"
@@ -10,6 +11,7 @@
 
 #include <QApplication>
 #include <QCommandLineParser>
+#include <QLineEdit>
 #include <QTimer>
 
 using namespace kv;
@@ -111,10 +113,13 @@ int main(int argc, char* argv[]) {
     parser.addHelpOption();
     const QCommandLineOption family({"f", "family"}, "720, 716, 760 or 0", "family", "720");
     const QCommandLineOption remote("remote", "KV720 output under remote control");
+    const QCommandLineOption reading("reading", "Input_Reading, 0.01 % of span", "count");
+    const QCommandLineOption entry("entry", "text typed into the remote box (not connected)",
+                                   "text");
     const QCommandLineOption theme("theme", "colour theme 0 or 1", "theme", "0");
     const QCommandLineOption size("size", "window size WxH", "size", "900x260");
     const QCommandLineOption shot("shot", "save a picture of the panel and quit", "file");
-    parser.addOptions({family, remote, theme, size, shot});
+    parser.addOptions({family, remote, reading, entry, theme, size, shot});
     parser.process(app);
 
     const QString name = parser.value(family);
@@ -127,6 +132,9 @@ int main(int argc, char* argv[]) {
     else
         identify(NoModuleMap);
 
+    if (parser.isSet(reading))
+        RegVal.Input_Reading = parser.value(reading).toInt();
+
     ModuleConnection connection;
     LivePanel panel(connection);
     panel.setWindowTitle(QStringLiteral("Live panel"));
@@ -135,6 +143,8 @@ int main(int argc, char* argv[]) {
     for (qint32 address : {RegAdd.Serial_No, RegAdd.Revision, RegAdd.Buss_ID, RegAdd.Int_Temp,
                            RegAdd.Resp1, RegAdd.Input_Reading})
         panel.KV700Display(address);
+    if (parser.isSet(entry))
+        panel.txtRemoteSet(0)->setText(parser.value(entry));
     const QStringList dimensions = parser.value(size).split(QLatin1Char('x'));
     if (dimensions.size() == 2)
         panel.resize(dimensions[0].toInt(), dimensions[1].toInt());

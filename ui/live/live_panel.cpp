@@ -282,9 +282,6 @@ void LivePanel::setRemoteRefused(int channel, bool refused) {
     QPalette palette = w.cmdRemote->palette();
     palette.setColor(QPalette::Button,
                      refused ? colours_.alarm : QApplication::palette().color(QPalette::Button));
-    palette.setColor(QPalette::ButtonText,
-                     refused ? colours_.background
-                             : QApplication::palette().color(QPalette::ButtonText));
     w.cmdRemote->setPalette(palette);
 }
 
