@@ -24,13 +24,4 @@ double RegisterRef::value(const RegMap& values) const {
     return 0.0;
 }
 
-void RegisterRef::setValue(RegMap& values, double value) const {
-    if (long_)
-        values.*long_ = qint32(value);
-    else if (int_)
-        values.*int_ = qint16(value);
-    else if (single_)
-        values.*single_ = float(value);
-}
-
 }  // namespace kv

@@ -50,7 +50,6 @@ public:
     int address(const RegMap& addresses) const;
     // The member's value in a value record (RegVal).
     double value(const RegMap& values) const;
-    void setValue(RegMap& values, double value) const;
 
 private:
     const char* name_ = "";

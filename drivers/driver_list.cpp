@@ -29,8 +29,13 @@ const DriverDescriptor* DriverForMap(int map) {
 }
 
 const DriverDescriptor* WindowDriverForMap(const DriverDescriptor& window, int map) {
+    return WindowDriverForMap(AllDrivers(), window, map);
+}
+
+const DriverDescriptor* WindowDriverForMap(const DriverList& drivers,
+                                           const DriverDescriptor& window, int map) {
     int sameWindow = 0;
-    for (const DriverDescriptor* driver : AllDrivers()) {
+    for (const DriverDescriptor* driver : drivers) {
         if (std::strcmp(driver->run.window, window.run.window) != 0)
             continue;
         ++sameWindow;

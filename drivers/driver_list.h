@@ -23,5 +23,8 @@ const DriverDescriptor* DriverForMap(int map);
 // whatever the map (its model check then names the wrong module); nullptr
 // when a window with several drivers has none for the map.
 const DriverDescriptor* WindowDriverForMap(const DriverDescriptor& window, int map);
+// The same choice among `drivers`.
+const DriverDescriptor* WindowDriverForMap(const DriverList& drivers,
+                                           const DriverDescriptor& window, int map);
 
 }  // namespace kv

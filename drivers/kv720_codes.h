@@ -17,6 +17,23 @@ enum Kv720InputType : qint32 {
     Kv720StrainGauge = 8,
 };
 
+// Bits of the control flag word (Flag_A).
+enum Kv720FlagBit {
+    Kv720OffsetBit = 0,       // offset direction chosen by the input calibration
+    Kv720ResponseBit = 1,     // fast response
+    Kv720LimitsBit = 2,       // signal limits on
+    Kv720ReverseBit = 3,      // reverse action
+    Kv720VoltageBit = 4,      // the excitation is a voltage source
+    Kv720HighBandBit = 5,     // the excitation is in its high band
+    Kv720BurnOutBit = 6,      // thermocouple burn-out detection ...
+    Kv720BurnOutDownBit = 7,  // ... down scale
+};
+// Bits of the input channel register (in_ch).
+enum Kv720ChannelBit { Kv720DifferentialBit = 2, Kv720RemoteBit = 7 };
+
+constexpr qint32 Kv720UntrimmedGain =
+    10000;  // Gain_Factor of a module not trimmed since programming
+
 // The settings window's name of an input type; "" outside 1..8.
 QString Kv720InputTypeText(qint32 inputType);
 // Shape and unit texts of a code; "" for a code not offered by the type,

@@ -18,17 +18,7 @@ namespace {
 
 constexpr int Kv720Map = 3;
 constexpr double PauseSeconds = 0.1;
-constexpr qint32 UntrimmedGain = 10000;
 constexpr int LastRange = RangeEntries - 1;
-
-// Control flag bits (Flag_A) and the remote bit of the input channel.
-constexpr int OffsetBit = 0;
-constexpr int ResponseBit = 1;
-constexpr int LimitsBit = 2;
-constexpr int ReverseBit = 3;
-constexpr int BurnOutBit = 6;
-constexpr int BurnOutDownBit = 7;
-constexpr int RemoteBit = 7;
 
 DriverWork work720;
 
@@ -66,7 +56,7 @@ bool verifyInputRange(StepContext& step, QString& text) {
         return false;
     }
     step.work.DrvInCh =
-        qint16(withBit(quint16(step.work.DrvInCh), RemoteBit, step.settings.RemoteCont != 0));
+        qint16(withBit(quint16(step.work.DrvInCh), Kv720RemoteBit, step.settings.RemoteCont != 0));
     return true;
 }
 
@@ -88,20 +78,20 @@ bool inputCalibration(StepContext& step, QString& text) {
     if (!Kv720InputCalibration(rangeFull, RegVal, step.work.DrvInLo, step.work.DrvInHi, counts,
                                text))
         return false;
-    quint16 flags = withBit(quint16(RegVal.Flag_A), OffsetBit, counts.offsetBit);
+    quint16 flags = withBit(quint16(RegVal.Flag_A), Kv720OffsetBit, counts.offsetBit);
     qint32 auxCount = 0;
     if (!toCount(Kv720AuxCount(s, RegVal, flags), auxCount, text))
         return false;
     // Burn-out detection belongs to thermocouples; other inputs leave it off.
     const bool thermocouple = s.Inp1RngTyp == Kv720Thermocouple;
-    flags = withBit(flags, BurnOutBit, thermocouple && s.Inp1BurnOut >= 1);
-    flags = withBit(flags, BurnOutDownBit, thermocouple && s.Inp1BurnOut == 2);
+    flags = withBit(flags, Kv720BurnOutBit, thermocouple && s.Inp1BurnOut >= 1);
+    flags = withBit(flags, Kv720BurnOutDownBit, thermocouple && s.Inp1BurnOut == 2);
     if (thermocouple &&
         !BuildTableC(s.TableC, 0.0, rangeFull, s.Inp1Shape, text, RegVal.CIN_F, RegVal.CIN_Z))
         return false;
-    flags = withBit(flags, ResponseBit, s.Inp1Respon == 1);
-    flags = withBit(flags, LimitsBit, s.UserLmtEna == 1);
-    flags = withBit(flags, ReverseBit, s.DirecrReve == 1);
+    flags = withBit(flags, Kv720ResponseBit, s.Inp1Respon == 1);
+    flags = withBit(flags, Kv720LimitsBit, s.UserLmtEna == 1);
+    flags = withBit(flags, Kv720ReverseBit, s.DirecrReve == 1);
 
     qint32 zero = 0;
     qint32 full = 0;
@@ -112,7 +102,7 @@ bool inputCalibration(StepContext& step, QString& text) {
     RegVal.Aux_C = auxCount;
     RegVal.Flag_A = qint16(flags);
     RegVal.Orig_OS_PWM = zero;
-    RegVal.Gain_Factor = UntrimmedGain;
+    RegVal.Gain_Factor = Kv720UntrimmedGain;
     RegVal.Orig_FlagA = RegVal.Flag_A;
     return true;
 }

@@ -45,8 +45,6 @@ constexpr double PositiveLimitCount = 175.0;
 
 constexpr float CurrentBandLimit = 0.8f;  // mA; above it the high current band
 constexpr float VoltageBandLimit = 3.2f;  // V; from it the high voltage band
-constexpr int VoltageSourceBit = 4;
-constexpr int HighBandBit = 5;
 
 // One excitation band: value = (count - zero) / (full - zero) * span + start.
 struct AuxBand {
@@ -294,8 +292,8 @@ double Kv720AuxCount(const SettingsSet& settings, const RegMap& factory, quint16
     const bool current = settings.AuxIsI == 1;
     const bool high =
         current ? settings.AuxVmA > CurrentBandLimit : settings.AuxVmA >= VoltageBandLimit;
-    flags = current ? ClearBit(flags, VoltageSourceBit) : SetBit(flags, VoltageSourceBit);
-    flags = high ? SetBit(flags, HighBandBit) : ClearBit(flags, HighBandBit);
+    flags = current ? ClearBit(flags, Kv720VoltageBit) : SetBit(flags, Kv720VoltageBit);
+    flags = high ? SetBit(flags, Kv720HighBandBit) : ClearBit(flags, Kv720HighBandBit);
     const AuxBand& band = bandOf(current, high);
     const double zero = band.zero.value(factory);
     const double full = band.full.value(factory);
@@ -304,9 +302,9 @@ double Kv720AuxCount(const SettingsSet& settings, const RegMap& factory, quint16
 
 bool Kv720AuxFromCount(qint32 count, quint16 flags, const RegMap& factory, float& value,
                        qint32& isCurrent) {
-    const bool current = !TestBit(flags, VoltageSourceBit);
+    const bool current = !TestBit(flags, Kv720VoltageBit);
     isCurrent = current ? 1 : 0;
-    const AuxBand& band = bandOf(current, TestBit(flags, HighBandBit));
+    const AuxBand& band = bandOf(current, TestBit(flags, Kv720HighBandBit));
     const double zero = band.zero.value(factory);
     const double full = band.full.value(factory);
     if (full == zero)

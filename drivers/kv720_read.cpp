@@ -12,14 +12,6 @@ namespace kv {
 
 namespace {
 
-constexpr int DifferentialBit = 2;  // of in_ch
-constexpr int RemoteBit = 7;        // of in_ch
-constexpr int ResponseBit = 1;      // of Flag_A, and the two below
-constexpr int LimitsBit = 2;
-constexpr int ReverseBit = 3;
-constexpr int BurnOutBit = 6;
-constexpr int BurnOutDownBit = 7;
-constexpr qint32 UntrimmedGain = 10000;
 constexpr int LastRange = RangeEntries - 1;
 
 qint32 bit(quint16 flags, int n) {
@@ -47,20 +39,20 @@ void decodeOutput(SettingsSet& settings, DriverWork& work) {
 
 void decodeInputOptions(SettingsSet& settings) {
     const quint16 channel = quint16(RegVal.in_ch);
-    settings.Typ1Differ = bit(channel, DifferentialBit);
-    settings.RemoteCont = bit(channel, RemoteBit);
+    settings.Typ1Differ = bit(channel, Kv720DifferentialBit);
+    settings.RemoteCont = bit(channel, Kv720RemoteBit);
     // The impedance register holds 1 for a normal input and the channel value
     // (3 or 4) for a loaded one; any other value reads as loaded too.
     settings.Typ1InRes = RegVal.in_res > 1 ? 1 : 0;
 
     const quint16 flags = quint16(RegVal.Flag_A);
-    settings.Inp1Respon = bit(flags, ResponseBit);
-    settings.UserLmtEna = bit(flags, LimitsBit);
-    settings.DirecrReve = bit(flags, ReverseBit);
+    settings.Inp1Respon = bit(flags, Kv720ResponseBit);
+    settings.UserLmtEna = bit(flags, Kv720LimitsBit);
+    settings.DirecrReve = bit(flags, Kv720ReverseBit);
     settings.Inp1BurnOut =
-        !TestBit(flags, BurnOutBit) ? 0 : (TestBit(flags, BurnOutDownBit) ? 2 : 1);
+        !TestBit(flags, Kv720BurnOutBit) ? 0 : (TestBit(flags, Kv720BurnOutDownBit) ? 2 : 1);
     const bool untrimmed = RegVal.Orig_FlagA == RegVal.Flag_A &&
-                           RegVal.Gain_Factor == UntrimmedGain &&
+                           RegVal.Gain_Factor == Kv720UntrimmedGain &&
                            RegVal.Usr_In1_Z == RegVal.Orig_OS_PWM;
     settings.MinorTrim = untrimmed ? 0 : 1;
 }

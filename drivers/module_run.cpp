@@ -62,6 +62,8 @@ bool ModuleRun::start(RunKind kind, const DriverDescriptor& driver, QString& err
     kind_ = kind;
     driver_ = &driver;
     startMap_ = ModuleMap;
+    startSerial_ = RegVal.Serial_No;
+    confirming_ = false;
     warning_.clear();
     const bool programming = kind == RunKind::Programming;
     const QString status = programming ? QStringLiteral("Programming..")
@@ -109,6 +111,10 @@ const DriverDescriptor* ModuleRun::currentDriver(const char* RunTexts::*unknownM
 }
 
 void ModuleRun::step(qint32 address, qint16 busId) {
+    if (confirming_) {
+        confirm(address, busId);
+        return;
+    }
     const bool programming = kind_ == RunKind::Programming;
     QString text;
     const DriverDescriptor* driver =
@@ -118,24 +124,17 @@ void ModuleRun::step(qint32 address, qint16 busId) {
         return;
     }
     RequestEngine& engine = connection_.engine();
-    QString requester = tag_;
     const RegisterRef& last = programming ? driver->lastProgrammed : driver->lastRead;
     if (address == last.address(RegAdd)) {
-        if (programming) {
-            settings_.MinorTrim = 0;
-            succeed(QLatin1String(driver->run.programmed));
-            return;
-        }
-        // The warning goes with the map the read was made for.
-        const DriverDescriptor* reader = currentDriver(&RunTexts::unknownMapWarning, text);
-        if (!reader) {
-            end(false, text);
-            return;
-        }
-        Dispatch(*reader, engine, DispatchWarning, requester, settings_, address, busId, warning_);
-        succeed(ModelText(RegVal.Mod_Type, RegVal.TypInput) + QStringLiteral(" Settings Read.."));
+        // Before anything is reported done, make sure the module that answered
+        // the last step is the one the run started on.
+        confirming_ = true;
+        if (!engine.R_CB(RegAdd.Serial_No, RunBusId, tag_, programming ? CallbackSet : CallbackGet,
+                         text))
+            fail(address, busId, text);
         return;
     }
+    QString requester = tag_;
     const qint16 kind = programming ? DispatchProgram : DispatchRead;
     if (!Dispatch(*driver, engine, kind, requester, settings_, address, busId, text)) {
         fail(address, busId, text);
@@ -147,6 +146,30 @@ void ModuleRun::step(qint32 address, qint16 busId) {
         return;
     }
     emit progress(GetRegDescription(address, busId), driver->work->DrvStep + 1, stepCount());
+}
+
+void ModuleRun::confirm(qint32 address, qint16 busId) {
+    confirming_ = false;
+    if (address != RegAdd.Serial_No || RegVal.Serial_No != startSerial_) {
+        fail(address, busId, QStringLiteral("Module changed"));
+        return;
+    }
+    if (kind_ == RunKind::Programming) {
+        settings_.MinorTrim = 0;
+        succeed(QLatin1String(driver_->run.programmed));
+        return;
+    }
+    // The warning goes with the map the read was made for.
+    QString text;
+    const DriverDescriptor* reader = currentDriver(&RunTexts::unknownMapWarning, text);
+    if (!reader) {
+        end(false, text);
+        return;
+    }
+    QString requester = tag_;
+    Dispatch(*reader, connection_.engine(), DispatchWarning, requester, settings_, address, busId,
+             warning_);
+    succeed(ModelText(RegVal.Mod_Type, RegVal.TypInput) + QStringLiteral(" Settings Read.."));
 }
 
 void ModuleRun::fail(qint32 address, qint16 busId, const QString& reason) {

@@ -2,10 +2,11 @@
 // One programming or reading run of the connected module, as a settings window
 // or the command-line tool starts it. The run reserves the engine, asks for the
 // module type (the pseudo-address 1 of the settings windows), forwards every
-// later callback to the model's dispatcher, and ends on the model's last
-// register, on a failed step, on a request the engine gave up, or when the
-// connection goes away. Every end releases the engine and emits finished()
-// exactly once.
+// later callback to the model's dispatcher, and after the model's last
+// register reads the serial number once more: only the module the run started
+// on counts as programmed or read. It fails on a failed step, on a request the
+// engine gave up, when the connection goes away or the module was changed.
+// Every end releases the engine and emits finished() exactly once.
 
 #include "drivers/driver_descriptor.h"
 #include "engine/callback_receiver.h"
@@ -61,6 +62,7 @@ signals:
 private:
     bool start(RunKind kind, const DriverDescriptor& driver, QString& error);
     void step(qint32 address, qint16 busId);
+    void confirm(qint32 address, qint16 busId);
     // Ends the run with a failure text that names the register.
     void fail(qint32 address, qint16 busId, const QString& reason);
     void succeed(const QString& text);
@@ -75,6 +77,8 @@ private:
     RunKind kind_ = RunKind::Programming;
     const DriverDescriptor* driver_ = nullptr;
     int startMap_ = 0;
+    qint32 startSerial_ = 0;
+    bool confirming_ = false;  // the last register is done; the serial number is being read
     SettingsSet settings_;
     QString warning_;
 };
