@@ -120,7 +120,8 @@ std::vector<Frame> kv714v1Programming() {
         .write("Usr_Out1_Z")
         .write("Sig_Lmt1_F")
         .write("Sig_Lmt1_Z")
-        .write("Buss_ID");
+        .write("Buss_ID")
+        .moduleConfirmed();
     return e.frames();
 }
 
@@ -143,7 +144,8 @@ std::vector<Frame> kv716v1Programming() {
         .write("Sig_Lmt1_F")
         .write("Sig_Lmt1_Z")
         .write("IO_Dir")
-        .write("Buss_ID");
+        .write("Buss_ID")
+        .moduleConfirmed();
     return e.frames();
 }
 
@@ -154,7 +156,8 @@ std::vector<Frame> kv714v1Reading() {
         .read("Sig_Lmt_On")
         .read("In_Rng1")
         .read("Out_Rng1")
-        .read("Int_Temp");
+        .read("Int_Temp")
+        .moduleConfirmed();
     return e.frames();
 }
 
@@ -167,7 +170,8 @@ std::vector<Frame> kv716v1Reading() {
         .read("In_Rng1")
         .read("Out_Rng2")
         .read("Out_Rng1")
-        .read("Int_Temp");
+        .read("Int_Temp")
+        .moduleConfirmed();
     return e.frames();
 }
 
@@ -197,7 +201,7 @@ std::vector<Frame> v2Programming(int map, bool kv716) {
             .write("Usr_Out2_F")
             .write("Sig_Lmt2_Z")
             .write("Sig_Lmt2_F");
-    e.write("Flag_A").table1().read("Input_B4_Table").write("Buss_ID");
+    e.write("Flag_A").table1().read("Input_B4_Table").write("Buss_ID").moduleConfirmed();
     return e.frames();
 }
 
@@ -236,7 +240,7 @@ std::vector<Frame> v2Reading(int map, bool kv716) {
             .read("Usr_Out2_F")
             .read("Sig_Lmt2_Z")
             .read("Sig_Lmt2_F");
-    e.read("In_Rng1").table1(true).read("Input_B4_Table").read("Int_Temp");
+    e.read("In_Rng1").table1(true).read("Input_B4_Table").read("Int_Temp").moduleConfirmed();
     return e.frames();
 }
 

@@ -105,7 +105,8 @@ std::vector<drvbench::Frame> kv718Programming() {
         .write("Flag_A")
         .table1()
         .read("Input_B4_Table")
-        .write("Buss_ID");
+        .write("Buss_ID")
+        .moduleConfirmed();
     return e.frames();
 }
 
@@ -136,7 +137,8 @@ std::vector<drvbench::Frame> kv718Reading() {
         .read("In_Rng1")
         .table1(true)
         .read("Input_B4_Table")
-        .read("Int_Temp");
+        .read("Int_Temp")
+        .moduleConfirmed();
     return e.frames();
 }
 

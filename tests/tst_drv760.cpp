@@ -109,7 +109,8 @@ std::vector<drvbench::Frame> kv760Programming() {
         .read("Int_Temp")
         .write("Buss_ID")
         .data("Flag_C")
-        .read("Remote1");
+        .read("Remote1")
+        .moduleConfirmed();
     return e.frames();
 }
 
@@ -139,7 +140,8 @@ std::vector<drvbench::Frame> kv760Reading() {
         .read("Aux_V")
         .table1(true)
         .read("Remote1")
-        .read("Int_Temp");
+        .read("Int_Temp")
+        .moduleConfirmed();
     return e.frames();
 }
 

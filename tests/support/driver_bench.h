@@ -71,6 +71,9 @@ public:
             frames_.push_back({reading ? 'R' : 'W', id, at("Table1")});
         return *this;
     }
+    // After the last register the run reads the serial number to make sure the
+    // module is still the one it started on.
+    Expect& moduleConfirmed() { return read("Serial_No"); }
     const std::vector<Frame>& frames() const { return frames_; }
 
 private:
