@@ -1,6 +1,7 @@
 #include "drivers/kv7146v1_driver.h"
 
 #include "drivers/kv7146_flags.h"
+#include "drivers/read_back.h"
 #include "drivers/step_runner.h"
 #include "drivers/user_cal_step.h"
 
@@ -17,22 +18,6 @@ bool inputCalibration(StepContext& step, QString& text) {
     return CalibratePair(Input1Range, Input1Range.scale, step.settings, step.work, text);
 }
 
-bool output1Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output1Range, Output1Range.scale, step.settings, step.work, text);
-}
-
-bool limit1Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output1Range, Output1Range.limits, step.settings, step.work, text);
-}
-
-bool output2Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output2Range, Output2Range.scale, step.settings, step.work, text);
-}
-
-bool limit2Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output2Range, Output2Range.limits, step.settings, step.work, text);
-}
-
 // --- hooks of the reading orders ---
 
 // The user counts come from RegVal as the module's identification (and any
@@ -40,10 +25,7 @@ bool limit2Calibration(StepContext& step, QString& text) {
 void decodeCommon(StepContext& step) {
     SettingsSet& s = step.settings;
     QString& warning = step.work.DrvWarning;
-    s.ModTypeSet = RegVal.Mod_Type;
-    s.SerialNumb = RegVal.Serial_No;
-    s.BussIdenti = RegVal.Buss_ID;
-    s.SoftwarRev = RegVal.Revision;
+    ReadModuleIdentity(RegVal, s);
     s.Inp1Respon = RegVal.Resp1;
     s.UserLmtEna = RegVal.Sig_Lmt_On;
     if (!ReadUserRange(Input1Range, RegVal, s, warning))
@@ -72,58 +54,58 @@ using W = DriverWork;
 // Each pair goes full scale first, then zero.
 // clang-format off
 const StepRow kv714ProgramOrder[] = {
-    // acknowledged              work                next write
-    {On(REG(Mod_Type)),          inputCalibration,   Write(REG(In_Rng1), Setting(&S::Inp1RngTyp))},
-    {On(REG(In_Rng1)),           nullptr,            Write(REG(Usr_In1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_In1_F)),         nullptr,            Write(REG(Usr_In1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Usr_In1_Z)),         nullptr,            Write(REG(Resp1), Setting(&S::Inp1Respon))},
-    {On(REG(Resp1)),             nullptr,            Write(REG(Sig_Lmt_On), Setting(&S::UserLmtEna))},
-    {On(REG(Sig_Lmt_On)),        output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
-    {On(REG(Out_Rng1)),          nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out1_F)),        nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Usr_Out1_Z)),        limit1Calibration,  Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
-    {On(REG(Sig_Lmt1_F)),        nullptr,            Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Sig_Lmt1_Z)),        nullptr,            Write(REG(Buss_ID), Setting(&S::BussIdenti))},
+    // acknowledged       work                next write
+    {On(REG(Mod_Type)),   inputCalibration,   Write(REG(In_Rng1), Setting(&S::Inp1RngTyp))},
+    {On(REG(In_Rng1)),    nullptr,            Write(REG(Usr_In1_F), Work(&W::DrvOutF))},
+    {On(REG(Usr_In1_F)),  nullptr,            Write(REG(Usr_In1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_In1_Z)),  nullptr,            Write(REG(Resp1), Setting(&S::Inp1Respon))},
+    {On(REG(Resp1)),      nullptr,            Write(REG(Sig_Lmt_On), Setting(&S::UserLmtEna))},
+    {On(REG(Sig_Lmt_On)), Output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
+    {On(REG(Out_Rng1)),   nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
+    {On(REG(Usr_Out1_F)), nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out1_Z)), Limit1Calibration,  Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
+    {On(REG(Sig_Lmt1_F)), nullptr,            Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Sig_Lmt1_Z)), nullptr,            Write(REG(Buss_ID), Setting(&S::BussIdenti))},
 };
 
 // Output 2 goes completely before output 1.
 const StepRow kv716ProgramOrder[] = {
-    // acknowledged              work                next write
-    {On(REG(Mod_Type)),          inputCalibration,   Write(REG(In_Rng1), Setting(&S::Inp1RngTyp))},
-    {On(REG(In_Rng1)),           nullptr,            Write(REG(Usr_In1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_In1_F)),         nullptr,            Write(REG(Usr_In1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Usr_In1_Z)),         nullptr,            Write(REG(Resp1), Setting(&S::Inp1Respon))},
-    {On(REG(Resp1)),             nullptr,            Write(REG(Sig_Lmt_On), Setting(&S::UserLmtEna))},
-    {On(REG(Sig_Lmt_On)),        output2Calibration, Write(REG(Out_Rng2), Setting(&S::Out2RngTyp))},
-    {On(REG(Out_Rng2)),          nullptr,            Write(REG(Usr_Out2_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out2_F)),        nullptr,            Write(REG(Usr_Out2_Z), Work(&W::DrvOutZ))},
-    {On(REG(Usr_Out2_Z)),        limit2Calibration,  Write(REG(Sig_Lmt2_F), Work(&W::DrvOutF))},
-    {On(REG(Sig_Lmt2_F)),        nullptr,            Write(REG(Sig_Lmt2_Z), Work(&W::DrvOutZ))},
-    {On(REG(Sig_Lmt2_Z)),        output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
-    {On(REG(Out_Rng1)),          nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out1_F)),        nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Usr_Out1_Z)),        limit1Calibration,  Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
-    {On(REG(Sig_Lmt1_F)),        nullptr,            Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Sig_Lmt1_Z)),        nullptr,            Write(REG(IO_Dir), Setting(&S::DirecrReve))},
-    {On(REG(IO_Dir)),            nullptr,            Write(REG(Buss_ID), Setting(&S::BussIdenti))},
+    // acknowledged       work                next write
+    {On(REG(Mod_Type)),   inputCalibration,   Write(REG(In_Rng1), Setting(&S::Inp1RngTyp))},
+    {On(REG(In_Rng1)),    nullptr,            Write(REG(Usr_In1_F), Work(&W::DrvOutF))},
+    {On(REG(Usr_In1_F)),  nullptr,            Write(REG(Usr_In1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_In1_Z)),  nullptr,            Write(REG(Resp1), Setting(&S::Inp1Respon))},
+    {On(REG(Resp1)),      nullptr,            Write(REG(Sig_Lmt_On), Setting(&S::UserLmtEna))},
+    {On(REG(Sig_Lmt_On)), Output2Calibration, Write(REG(Out_Rng2), Setting(&S::Out2RngTyp))},
+    {On(REG(Out_Rng2)),   nullptr,            Write(REG(Usr_Out2_F), Work(&W::DrvOutF))},
+    {On(REG(Usr_Out2_F)), nullptr,            Write(REG(Usr_Out2_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out2_Z)), Limit2Calibration,  Write(REG(Sig_Lmt2_F), Work(&W::DrvOutF))},
+    {On(REG(Sig_Lmt2_F)), nullptr,            Write(REG(Sig_Lmt2_Z), Work(&W::DrvOutZ))},
+    {On(REG(Sig_Lmt2_Z)), Output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
+    {On(REG(Out_Rng1)),   nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
+    {On(REG(Usr_Out1_F)), nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out1_Z)), Limit1Calibration,  Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
+    {On(REG(Sig_Lmt1_F)), nullptr,            Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Sig_Lmt1_Z)), nullptr,            Write(REG(IO_Dir), Setting(&S::DirecrReve))},
+    {On(REG(IO_Dir)),     nullptr,            Write(REG(Buss_ID), Setting(&S::BussIdenti))},
 };
 
 const StepRow kv714ReadOrder[] = {
-    {On(REG(Mod_Type)),          nullptr,            Read(REG(Buss_ID))},
-    {On(REG(Buss_ID)),           nullptr,            Read(REG(Sig_Lmt_On))},
-    {On(REG(Sig_Lmt_On)),        nullptr,            Read(REG(In_Rng1))},
-    {On(REG(In_Rng1)),           nullptr,            Read(REG(Out_Rng1))},
-    {On(REG(Out_Rng1)),          decodeKv714,        Read(REG(Int_Temp))},
+    {On(REG(Mod_Type)),   nullptr,     Read(REG(Buss_ID))},
+    {On(REG(Buss_ID)),    nullptr,     Read(REG(Sig_Lmt_On))},
+    {On(REG(Sig_Lmt_On)), nullptr,     Read(REG(In_Rng1))},
+    {On(REG(In_Rng1)),    nullptr,     Read(REG(Out_Rng1))},
+    {On(REG(Out_Rng1)),   decodeKv714, Read(REG(Int_Temp))},
 };
 
 const StepRow kv716ReadOrder[] = {
-    {On(REG(Mod_Type)),          nullptr,            Read(REG(Buss_ID))},
-    {On(REG(Buss_ID)),           nullptr,            Read(REG(Sig_Lmt_On))},
-    {On(REG(Sig_Lmt_On)),        nullptr,            Read(REG(IO_Dir))},
-    {On(REG(IO_Dir)),            nullptr,            Read(REG(In_Rng1))},
-    {On(REG(In_Rng1)),           nullptr,            Read(REG(Out_Rng2))},
-    {On(REG(Out_Rng2)),          nullptr,            Read(REG(Out_Rng1))},
-    {On(REG(Out_Rng1)),          decodeKv716,        Read(REG(Int_Temp))},
+    {On(REG(Mod_Type)),   nullptr,     Read(REG(Buss_ID))},
+    {On(REG(Buss_ID)),    nullptr,     Read(REG(Sig_Lmt_On))},
+    {On(REG(Sig_Lmt_On)), nullptr,     Read(REG(IO_Dir))},
+    {On(REG(IO_Dir)),     nullptr,     Read(REG(In_Rng1))},
+    {On(REG(In_Rng1)),    nullptr,     Read(REG(Out_Rng2))},
+    {On(REG(Out_Rng2)),   nullptr,     Read(REG(Out_Rng1))},
+    {On(REG(Out_Rng1)),   decodeKv716, Read(REG(Int_Temp))},
 };
 // clang-format on
 

@@ -1,12 +1,11 @@
 #include "drivers/kv7146v2_driver.h"
 
 #include "drivers/kv7146_flags.h"
+#include "drivers/read_back.h"
 #include "drivers/step_runner.h"
 #include "drivers/user_cal_step.h"
-#include "model/linearisation.h"
 #include "model/range_table.h"
 #include "model/register_values.h"
-#include "model/table_transfer.h"
 
 namespace kv {
 
@@ -37,31 +36,12 @@ bool inputCalibration(StepContext& step, QString& text) {
     return CalibratePair(measuredInput, measuredInput.scale, step.settings, step.work, text);
 }
 
-bool output1Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output1Range, Output1Range.scale, step.settings, step.work, text);
-}
-
-bool limit1Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output1Range, Output1Range.limits, step.settings, step.work, text);
-}
-
-bool output2Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output2Range, Output2Range.scale, step.settings, step.work, text);
-}
-
-bool limit2Calibration(StepContext& step, QString& text) {
-    return CalibratePair(Output2Range, Output2Range.limits, step.settings, step.work, text);
-}
-
 // --- hook of the reading orders ---
 
 bool decodeRead(StepContext& step, QString&) {
     SettingsSet& s = step.settings;
     QString& warning = step.work.DrvWarning;
-    s.ModTypeSet = RegVal.Mod_Type;
-    s.SerialNumb = RegVal.Serial_No;
-    s.BussIdenti = RegVal.Buss_ID;
-    s.SoftwarRev = RegVal.Revision;
+    ReadModuleIdentity(RegVal, s);
     s.Inp1RngSet = RegVal.In_Rng1;
     s.Inp1mU_Zro = RegVal.Meas_Unit_Z;
     s.Inp1mU_Ful = RegVal.Meas_Unit_F;
@@ -73,10 +53,7 @@ bool decodeRead(StepContext& step, QString&) {
         warning += QStringLiteral("Invalid Output 1 Range");
     if (step.driver.family == KV716v2 && !ReadUserRange(Output2Range, RegVal, s, warning))
         warning += QStringLiteral("Invalid Output 2 Range");
-    // A table whose checksum failed has been reported; the record keeps its own.
-    QString checksum;
-    if (CheckTableReadBack(RegVal.Table1_Pts.data(), Table1LastUsed, checksum))
-        s.Table1 = RegVal.Table1_Pts;
+    ReadTable1(RegVal, s);
     return true;
 }
 
@@ -100,10 +77,10 @@ const StepRow kv714ProgramOrder[] = {
     {On(REG(Meas_Unit_F)),            inputCalibration,   Write(REG(In_Rng1), Setting(&S::Inp1RngSet))},
     {On(REG(In_Rng1)),                nullptr,            Write(REG(Usr_In1_Z), Work(&W::DrvOutZ))},
     {On(REG(Usr_In1_Z)),              nullptr,            Write(REG(Usr_In1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_In1_F)),              output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
+    {On(REG(Usr_In1_F)),              Output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
     {On(REG(Out_Rng1)),               nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
     {On(REG(Usr_Out1_Z)),             nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out1_F)),             limit1Calibration,  Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out1_F)),             Limit1Calibration,  Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
     {On(REG(Sig_Lmt1_Z)),             nullptr,            Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
     {On(REG(Sig_Lmt1_F)),             nullptr,            Write(REG(Flag_A), Computed(REG(Flag_A)))},
     {On(REG(Flag_A)),                 nullptr,            FirstTablePart(REG(Table1))},
@@ -125,15 +102,15 @@ const StepRow kv716ProgramOrder[] = {
     {On(REG(Meas_Unit_F)),            inputCalibration,   Write(REG(In_Rng1), Setting(&S::Inp1RngSet))},
     {On(REG(In_Rng1)),                nullptr,            Write(REG(Usr_In1_Z), Work(&W::DrvOutZ))},
     {On(REG(Usr_In1_Z)),              nullptr,            Write(REG(Usr_In1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_In1_F)),              output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
+    {On(REG(Usr_In1_F)),              Output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
     {On(REG(Out_Rng1)),               nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
     {On(REG(Usr_Out1_Z)),             nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out1_F)),             limit1Calibration,  Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out1_F)),             Limit1Calibration,  Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
     {On(REG(Sig_Lmt1_Z)),             nullptr,            Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
-    {On(REG(Sig_Lmt1_F)),             output2Calibration, Write(REG(Out_Rng2), Setting(&S::Out2RngTyp))},
+    {On(REG(Sig_Lmt1_F)),             Output2Calibration, Write(REG(Out_Rng2), Setting(&S::Out2RngTyp))},
     {On(REG(Out_Rng2)),               nullptr,            Write(REG(Usr_Out2_Z), Work(&W::DrvOutZ))},
     {On(REG(Usr_Out2_Z)),             nullptr,            Write(REG(Usr_Out2_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out2_F)),             limit2Calibration,  Write(REG(Sig_Lmt2_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out2_F)),             Limit2Calibration,  Write(REG(Sig_Lmt2_Z), Work(&W::DrvOutZ))},
     {On(REG(Sig_Lmt2_Z)),             nullptr,            Write(REG(Sig_Lmt2_F), Work(&W::DrvOutF))},
     {On(REG(Sig_Lmt2_F)),             nullptr,            Write(REG(Flag_A), Computed(REG(Flag_A)))},
     {On(REG(Flag_A)),                 nullptr,            FirstTablePart(REG(Table1))},
@@ -142,60 +119,60 @@ const StepRow kv716ProgramOrder[] = {
 };
 
 const StepRow kv714ReadOrder[] = {
-    {On(REG(Mod_Type)),               nullptr,            Read(REG(Buss_ID))},
-    {On(REG(Buss_ID)),                nullptr,            FirstFileNamePart(REG(File_Name))},
-    {OnFileNameParts(REG(File_Name)), nullptr,            Read(REG(TypInput))},
-    {On(REG(TypInput)),               nullptr,            Read(REG(Meas_Unit_Z))},
-    {On(REG(Meas_Unit_Z)),            nullptr,            Read(REG(Meas_Unit_F))},
-    {On(REG(Meas_Unit_F)),            nullptr,            Read(REG(Eng_In_F))},
-    {On(REG(Eng_In_F)),               nullptr,            Read(REG(Eng_In_Z))},
-    {On(REG(Eng_In_Z)),               nullptr,            Read(REG(Flag_A))},
-    {On(REG(Flag_A)),                 nullptr,            Read(REG(Out_Rng1))},
-    {On(REG(Out_Rng1)),               nullptr,            Read(REG(Usr_Out1_Z))},
-    {On(REG(Usr_Out1_Z)),             nullptr,            Read(REG(Usr_Out1_F))},
-    {On(REG(Usr_Out1_F)),             nullptr,            Read(REG(Sig_Lmt1_Z))},
-    {On(REG(Sig_Lmt1_Z)),             nullptr,            Read(REG(Sig_Lmt1_F))},
-    {On(REG(Sig_Lmt1_F)),             nullptr,            Read(REG(Eng_Unit1))},
-    {On(REG(Eng_Unit1)),              nullptr,            Read(REG(Eng_Unit2))},
-    {On(REG(Eng_Unit2)),              nullptr,            Read(REG(Eng_Unit3))},
-    {On(REG(Eng_Unit3)),              nullptr,            Read(REG(Eng_Unit4))},
-    {On(REG(Eng_Unit4)),              nullptr,            Read(REG(Usr_In1_Z))},
-    {On(REG(Usr_In1_Z)),              nullptr,            Read(REG(Usr_In1_F))},
-    {On(REG(Usr_In1_F)),              nullptr,            Read(REG(In_Rng1))},
-    {On(REG(In_Rng1)),                nullptr,            FirstTablePart(REG(Table1))},
-    {OnTableParts(REG(Table1)),       nullptr,            Read(REG(Input_B4_Table))},
-    {On(REG(Input_B4_Table)),         decodeRead,         Read(REG(Int_Temp))},
+    {On(REG(Mod_Type)),               nullptr,    Read(REG(Buss_ID))},
+    {On(REG(Buss_ID)),                nullptr,    FirstFileNamePart(REG(File_Name))},
+    {OnFileNameParts(REG(File_Name)), nullptr,    Read(REG(TypInput))},
+    {On(REG(TypInput)),               nullptr,    Read(REG(Meas_Unit_Z))},
+    {On(REG(Meas_Unit_Z)),            nullptr,    Read(REG(Meas_Unit_F))},
+    {On(REG(Meas_Unit_F)),            nullptr,    Read(REG(Eng_In_F))},
+    {On(REG(Eng_In_F)),               nullptr,    Read(REG(Eng_In_Z))},
+    {On(REG(Eng_In_Z)),               nullptr,    Read(REG(Flag_A))},
+    {On(REG(Flag_A)),                 nullptr,    Read(REG(Out_Rng1))},
+    {On(REG(Out_Rng1)),               nullptr,    Read(REG(Usr_Out1_Z))},
+    {On(REG(Usr_Out1_Z)),             nullptr,    Read(REG(Usr_Out1_F))},
+    {On(REG(Usr_Out1_F)),             nullptr,    Read(REG(Sig_Lmt1_Z))},
+    {On(REG(Sig_Lmt1_Z)),             nullptr,    Read(REG(Sig_Lmt1_F))},
+    {On(REG(Sig_Lmt1_F)),             nullptr,    Read(REG(Eng_Unit1))},
+    {On(REG(Eng_Unit1)),              nullptr,    Read(REG(Eng_Unit2))},
+    {On(REG(Eng_Unit2)),              nullptr,    Read(REG(Eng_Unit3))},
+    {On(REG(Eng_Unit3)),              nullptr,    Read(REG(Eng_Unit4))},
+    {On(REG(Eng_Unit4)),              nullptr,    Read(REG(Usr_In1_Z))},
+    {On(REG(Usr_In1_Z)),              nullptr,    Read(REG(Usr_In1_F))},
+    {On(REG(Usr_In1_F)),              nullptr,    Read(REG(In_Rng1))},
+    {On(REG(In_Rng1)),                nullptr,    FirstTablePart(REG(Table1))},
+    {OnTableParts(REG(Table1)),       nullptr,    Read(REG(Input_B4_Table))},
+    {On(REG(Input_B4_Table)),         decodeRead, Read(REG(Int_Temp))},
 };
 
 const StepRow kv716ReadOrder[] = {
-    {On(REG(Mod_Type)),               nullptr,            Read(REG(Buss_ID))},
-    {On(REG(Buss_ID)),                nullptr,            FirstFileNamePart(REG(File_Name))},
-    {OnFileNameParts(REG(File_Name)), nullptr,            Read(REG(TypInput))},
-    {On(REG(TypInput)),               nullptr,            Read(REG(Meas_Unit_Z))},
-    {On(REG(Meas_Unit_Z)),            nullptr,            Read(REG(Meas_Unit_F))},
-    {On(REG(Meas_Unit_F)),            nullptr,            Read(REG(Eng_In_F))},
-    {On(REG(Eng_In_F)),               nullptr,            Read(REG(Eng_In_Z))},
-    {On(REG(Eng_In_Z)),               nullptr,            Read(REG(Flag_A))},
-    {On(REG(Flag_A)),                 nullptr,            Read(REG(Out_Rng1))},
-    {On(REG(Out_Rng1)),               nullptr,            Read(REG(Usr_Out1_Z))},
-    {On(REG(Usr_Out1_Z)),             nullptr,            Read(REG(Usr_Out1_F))},
-    {On(REG(Usr_Out1_F)),             nullptr,            Read(REG(Sig_Lmt1_Z))},
-    {On(REG(Sig_Lmt1_Z)),             nullptr,            Read(REG(Sig_Lmt1_F))},
-    {On(REG(Sig_Lmt1_F)),             nullptr,            Read(REG(Eng_Unit1))},
-    {On(REG(Eng_Unit1)),              nullptr,            Read(REG(Eng_Unit2))},
-    {On(REG(Eng_Unit2)),              nullptr,            Read(REG(Eng_Unit3))},
-    {On(REG(Eng_Unit3)),              nullptr,            Read(REG(Eng_Unit4))},
-    {On(REG(Eng_Unit4)),              nullptr,            Read(REG(Usr_In1_Z))},
-    {On(REG(Usr_In1_Z)),              nullptr,            Read(REG(Usr_In1_F))},
-    {On(REG(Usr_In1_F)),              nullptr,            Read(REG(Out_Rng2))},
-    {On(REG(Out_Rng2)),               nullptr,            Read(REG(Usr_Out2_Z))},
-    {On(REG(Usr_Out2_Z)),             nullptr,            Read(REG(Usr_Out2_F))},
-    {On(REG(Usr_Out2_F)),             nullptr,            Read(REG(Sig_Lmt2_Z))},
-    {On(REG(Sig_Lmt2_Z)),             nullptr,            Read(REG(Sig_Lmt2_F))},
-    {On(REG(Sig_Lmt2_F)),             nullptr,            Read(REG(In_Rng1))},
-    {On(REG(In_Rng1)),                nullptr,            FirstTablePart(REG(Table1))},
-    {OnTableParts(REG(Table1)),       nullptr,            Read(REG(Input_B4_Table))},
-    {On(REG(Input_B4_Table)),         decodeRead,         Read(REG(Int_Temp))},
+    {On(REG(Mod_Type)),               nullptr,    Read(REG(Buss_ID))},
+    {On(REG(Buss_ID)),                nullptr,    FirstFileNamePart(REG(File_Name))},
+    {OnFileNameParts(REG(File_Name)), nullptr,    Read(REG(TypInput))},
+    {On(REG(TypInput)),               nullptr,    Read(REG(Meas_Unit_Z))},
+    {On(REG(Meas_Unit_Z)),            nullptr,    Read(REG(Meas_Unit_F))},
+    {On(REG(Meas_Unit_F)),            nullptr,    Read(REG(Eng_In_F))},
+    {On(REG(Eng_In_F)),               nullptr,    Read(REG(Eng_In_Z))},
+    {On(REG(Eng_In_Z)),               nullptr,    Read(REG(Flag_A))},
+    {On(REG(Flag_A)),                 nullptr,    Read(REG(Out_Rng1))},
+    {On(REG(Out_Rng1)),               nullptr,    Read(REG(Usr_Out1_Z))},
+    {On(REG(Usr_Out1_Z)),             nullptr,    Read(REG(Usr_Out1_F))},
+    {On(REG(Usr_Out1_F)),             nullptr,    Read(REG(Sig_Lmt1_Z))},
+    {On(REG(Sig_Lmt1_Z)),             nullptr,    Read(REG(Sig_Lmt1_F))},
+    {On(REG(Sig_Lmt1_F)),             nullptr,    Read(REG(Eng_Unit1))},
+    {On(REG(Eng_Unit1)),              nullptr,    Read(REG(Eng_Unit2))},
+    {On(REG(Eng_Unit2)),              nullptr,    Read(REG(Eng_Unit3))},
+    {On(REG(Eng_Unit3)),              nullptr,    Read(REG(Eng_Unit4))},
+    {On(REG(Eng_Unit4)),              nullptr,    Read(REG(Usr_In1_Z))},
+    {On(REG(Usr_In1_Z)),              nullptr,    Read(REG(Usr_In1_F))},
+    {On(REG(Usr_In1_F)),              nullptr,    Read(REG(Out_Rng2))},
+    {On(REG(Out_Rng2)),               nullptr,    Read(REG(Usr_Out2_Z))},
+    {On(REG(Usr_Out2_Z)),             nullptr,    Read(REG(Usr_Out2_F))},
+    {On(REG(Usr_Out2_F)),             nullptr,    Read(REG(Sig_Lmt2_Z))},
+    {On(REG(Sig_Lmt2_Z)),             nullptr,    Read(REG(Sig_Lmt2_F))},
+    {On(REG(Sig_Lmt2_F)),             nullptr,    Read(REG(In_Rng1))},
+    {On(REG(In_Rng1)),                nullptr,    FirstTablePart(REG(Table1))},
+    {OnTableParts(REG(Table1)),       nullptr,    Read(REG(Input_B4_Table))},
+    {On(REG(Input_B4_Table)),         decodeRead, Read(REG(Int_Temp))},
 };
 // clang-format on
 

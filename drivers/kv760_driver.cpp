@@ -1,12 +1,11 @@
 #include "drivers/kv760_driver.h"
 
 #include "drivers/kv760_input.h"
+#include "drivers/read_back.h"
 #include "drivers/step_runner.h"
 #include "drivers/user_cal_step.h"
 #include "model/codec.h"
-#include "model/linearisation.h"
 #include "model/register_values.h"
-#include "model/table_transfer.h"
 
 namespace kv {
 
@@ -50,14 +49,6 @@ bool secondFlagCWrite(StepContext& step, QString& text) {
     return false;
 }
 
-bool outputCalibration(StepContext& step, QString& text) {
-    return CalibratePair(Output1Range, Output1Range.scale, step.settings, step.work, text);
-}
-
-bool limitCalibration(StepContext& step, QString& text) {
-    return CalibratePair(Output1Range, Output1Range.limits, step.settings, step.work, text);
-}
-
 bool endProgramming(StepContext& step, QString&) {
     step.work.DrvBusID = SecondFlagCWrite;
     RegVal.Flag_C = qint16(ClearBit(quint16(RegVal.Flag_C), ProgrammingBit));
@@ -69,10 +60,7 @@ bool endProgramming(StepContext& step, QString&) {
 bool decodeRead(StepContext& step, QString&) {
     SettingsSet& s = step.settings;
     QString& warning = step.work.DrvWarning;
-    s.ModTypeSet = RegVal.Mod_Type;
-    s.SerialNumb = RegVal.Serial_No;
-    s.BussIdenti = RegVal.Buss_ID;
-    s.SoftwarRev = RegVal.Revision;
+    ReadModuleIdentity(RegVal, s);
     s.Inp1EngZro = RegVal.Eng_In_Z;
     s.Inp1EngFul = RegVal.Eng_In_F;
     s.Inp1EngUnt = EngUnitText(RegVal);
@@ -80,11 +68,7 @@ bool decodeRead(StepContext& step, QString&) {
 
     if (!ReadUserRange(Output1Range, RegVal, s, warning))
         warning += QStringLiteral("Invalid Output 1 Range, ");
-    // A table whose checksum failed has been reported; the record keeps its own.
-    QString checksum;
-    if (CheckTableReadBack(RegVal.Table1_Pts.data(), Table1LastUsed, checksum))
-        s.Table1 = RegVal.Table1_Pts;
-    step.work.DrvBusID = SecondFlagCWrite;
+    ReadTable1(RegVal, s);
     return true;
 }
 
@@ -94,59 +78,59 @@ using W = DriverWork;
 
 // clang-format off
 const StepRow programOrder[] = {
-    // acknowledged                           work               next request
-    {On(REG(Mod_Type)),                       startOfRun,        Write(REG(Flag_C), Computed(REG(Flag_C)))},
-    {On(REG(Flag_C), firstFlagCWrite),        nullptr,           FirstFileNamePart(REG(File_Name))},
-    {OnFileNameParts(REG(File_Name)),         nullptr,           Write(REG(Eng_Unit1), CharOf(&S::Inp1EngUnt, 0))},
-    {On(REG(Eng_Unit1)),                      nullptr,           Write(REG(Eng_Unit2), CharOf(&S::Inp1EngUnt, 1))},
-    {On(REG(Eng_Unit2)),                      nullptr,           Write(REG(Eng_Unit3), CharOf(&S::Inp1EngUnt, 2))},
-    {On(REG(Eng_Unit3)),                      nullptr,           Write(REG(Eng_Unit4), CharOf(&S::Inp1EngUnt, 3))},
-    {On(REG(Eng_Unit4)),                      nullptr,           Write(REG(Eng_In_Z), Setting(&S::Inp1EngZro))},
-    {On(REG(Eng_In_Z)),                       nullptr,           Write(REG(Eng_In_F), Setting(&S::Inp1EngFul))},
-    {On(REG(Eng_In_F)),                       nullptr,           Write(REG(Meas_Unit_Z), Computed(REG(Meas_Unit_Z)))},  // Hz
-    {On(REG(Meas_Unit_Z)),                    nullptr,           Write(REG(Meas_Unit_F), Computed(REG(Meas_Unit_F)))},  // Hz
-    {On(REG(Meas_Unit_F)),                    nullptr,           Write(REG(Trig_Level), Computed(REG(Trig_Level)))},
-    {On(REG(Trig_Level)),                     nullptr,           Write(REG(Aux_C), Computed(REG(Aux_C)))},
-    {On(REG(Aux_C)),                          nullptr,           Write(REG(Aux_V), Computed(REG(Aux_V)))},
-    {On(REG(Aux_V)),                          outputCalibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
-    {On(REG(Out_Rng1)),                       nullptr,           Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Usr_Out1_Z)),                     nullptr,           Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
-    {On(REG(Usr_Out1_F)),                     limitCalibration,  Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
-    {On(REG(Sig_Lmt1_Z)),                     nullptr,           Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
-    {On(REG(Sig_Lmt1_F)),                     nullptr,           Write(REG(Flag_A), Computed(REG(Flag_A)))},
-    {On(REG(Flag_A)),                         nullptr,           Write(REG(Type_In_Unit), Computed(REG(Type_In_Unit)))},
-    {On(REG(Type_In_Unit)),                   nullptr,           FirstTablePart(REG(Table1))},
-    {OnTableParts(REG(Table1)),               nullptr,           Read(REG(Int_Temp))},
-    {On(REG(Int_Temp)),                       nullptr,           Write(REG(Buss_ID), Setting(&S::BussIdenti))},
-    {On(REG(Buss_ID)),                        endProgramming,    WriteData(REG(Flag_C), Computed(REG(Flag_C)))},
-    {On(REG(Flag_C)),                         secondFlagCWrite,  Read(REG(Remote1))},
+    // acknowledged                    work                next request
+    {On(REG(Mod_Type)),                startOfRun,         Write(REG(Flag_C), Computed(REG(Flag_C)))},
+    {On(REG(Flag_C), firstFlagCWrite), nullptr,            FirstFileNamePart(REG(File_Name))},
+    {OnFileNameParts(REG(File_Name)),  nullptr,            Write(REG(Eng_Unit1), CharOf(&S::Inp1EngUnt, 0))},
+    {On(REG(Eng_Unit1)),               nullptr,            Write(REG(Eng_Unit2), CharOf(&S::Inp1EngUnt, 1))},
+    {On(REG(Eng_Unit2)),               nullptr,            Write(REG(Eng_Unit3), CharOf(&S::Inp1EngUnt, 2))},
+    {On(REG(Eng_Unit3)),               nullptr,            Write(REG(Eng_Unit4), CharOf(&S::Inp1EngUnt, 3))},
+    {On(REG(Eng_Unit4)),               nullptr,            Write(REG(Eng_In_Z), Setting(&S::Inp1EngZro))},
+    {On(REG(Eng_In_Z)),                nullptr,            Write(REG(Eng_In_F), Setting(&S::Inp1EngFul))},
+    {On(REG(Eng_In_F)),                nullptr,            Write(REG(Meas_Unit_Z), Computed(REG(Meas_Unit_Z)))},  // Hz
+    {On(REG(Meas_Unit_Z)),             nullptr,            Write(REG(Meas_Unit_F), Computed(REG(Meas_Unit_F)))},  // Hz
+    {On(REG(Meas_Unit_F)),             nullptr,            Write(REG(Trig_Level), Computed(REG(Trig_Level)))},
+    {On(REG(Trig_Level)),              nullptr,            Write(REG(Aux_C), Computed(REG(Aux_C)))},
+    {On(REG(Aux_C)),                   nullptr,            Write(REG(Aux_V), Computed(REG(Aux_V)))},
+    {On(REG(Aux_V)),                   Output1Calibration, Write(REG(Out_Rng1), Setting(&S::Out1RngTyp))},
+    {On(REG(Out_Rng1)),                nullptr,            Write(REG(Usr_Out1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Usr_Out1_Z)),              nullptr,            Write(REG(Usr_Out1_F), Work(&W::DrvOutF))},
+    {On(REG(Usr_Out1_F)),              Limit1Calibration,  Write(REG(Sig_Lmt1_Z), Work(&W::DrvOutZ))},
+    {On(REG(Sig_Lmt1_Z)),              nullptr,            Write(REG(Sig_Lmt1_F), Work(&W::DrvOutF))},
+    {On(REG(Sig_Lmt1_F)),              nullptr,            Write(REG(Flag_A), Computed(REG(Flag_A)))},
+    {On(REG(Flag_A)),                  nullptr,            Write(REG(Type_In_Unit), Computed(REG(Type_In_Unit)))},
+    {On(REG(Type_In_Unit)),            nullptr,            FirstTablePart(REG(Table1))},
+    {OnTableParts(REG(Table1)),        nullptr,            Read(REG(Int_Temp))},
+    {On(REG(Int_Temp)),                nullptr,            Write(REG(Buss_ID), Setting(&S::BussIdenti))},
+    {On(REG(Buss_ID)),                 endProgramming,     WriteData(REG(Flag_C), Computed(REG(Flag_C)))},
+    {On(REG(Flag_C)),                  secondFlagCWrite,   Read(REG(Remote1))},
 };
 
 const StepRow readOrder[] = {
-    {On(REG(Mod_Type)),                       nullptr,           Read(REG(Buss_ID))},
-    {On(REG(Buss_ID)),                        nullptr,           FirstFileNamePart(REG(File_Name))},
-    {OnFileNameParts(REG(File_Name)),         nullptr,           Read(REG(TypInput))},
-    {On(REG(TypInput)),                       nullptr,           Read(REG(Meas_Unit_Z))},
-    {On(REG(Meas_Unit_Z)),                    nullptr,           Read(REG(Meas_Unit_F))},
-    {On(REG(Meas_Unit_F)),                    nullptr,           Read(REG(Eng_In_F))},
-    {On(REG(Eng_In_F)),                       nullptr,           Read(REG(Eng_In_Z))},
-    {On(REG(Eng_In_Z)),                       nullptr,           Read(REG(Eng_Unit1))},
-    {On(REG(Eng_Unit1)),                      nullptr,           Read(REG(Eng_Unit2))},
-    {On(REG(Eng_Unit2)),                      nullptr,           Read(REG(Eng_Unit3))},
-    {On(REG(Eng_Unit3)),                      nullptr,           Read(REG(Eng_Unit4))},
-    {On(REG(Eng_Unit4)),                      nullptr,           Read(REG(Flag_A))},
-    {On(REG(Flag_A)),                         nullptr,           Read(REG(Type_In_Unit))},
-    {On(REG(Type_In_Unit)),                   nullptr,           Read(REG(Out_Rng1))},
-    {On(REG(Out_Rng1)),                       nullptr,           Read(REG(Usr_Out1_Z))},
-    {On(REG(Usr_Out1_Z)),                     nullptr,           Read(REG(Usr_Out1_F))},
-    {On(REG(Usr_Out1_F)),                     nullptr,           Read(REG(Sig_Lmt1_Z))},
-    {On(REG(Sig_Lmt1_Z)),                     nullptr,           Read(REG(Sig_Lmt1_F))},
-    {On(REG(Sig_Lmt1_F)),                     nullptr,           Read(REG(Trig_Level))},
-    {On(REG(Trig_Level)),                     nullptr,           Read(REG(Aux_C))},
-    {On(REG(Aux_C)),                          nullptr,           Read(REG(Aux_V))},
-    {On(REG(Aux_V)),                          nullptr,           FirstTablePart(REG(Table1))},
-    {OnTableParts(REG(Table1)),               nullptr,           Read(REG(Remote1))},
-    {On(REG(Remote1)),                        decodeRead,        Read(REG(Int_Temp))},
+    {On(REG(Mod_Type)),               nullptr,    Read(REG(Buss_ID))},
+    {On(REG(Buss_ID)),                nullptr,    FirstFileNamePart(REG(File_Name))},
+    {OnFileNameParts(REG(File_Name)), nullptr,    Read(REG(TypInput))},
+    {On(REG(TypInput)),               nullptr,    Read(REG(Meas_Unit_Z))},
+    {On(REG(Meas_Unit_Z)),            nullptr,    Read(REG(Meas_Unit_F))},
+    {On(REG(Meas_Unit_F)),            nullptr,    Read(REG(Eng_In_F))},
+    {On(REG(Eng_In_F)),               nullptr,    Read(REG(Eng_In_Z))},
+    {On(REG(Eng_In_Z)),               nullptr,    Read(REG(Eng_Unit1))},
+    {On(REG(Eng_Unit1)),              nullptr,    Read(REG(Eng_Unit2))},
+    {On(REG(Eng_Unit2)),              nullptr,    Read(REG(Eng_Unit3))},
+    {On(REG(Eng_Unit3)),              nullptr,    Read(REG(Eng_Unit4))},
+    {On(REG(Eng_Unit4)),              nullptr,    Read(REG(Flag_A))},
+    {On(REG(Flag_A)),                 nullptr,    Read(REG(Type_In_Unit))},
+    {On(REG(Type_In_Unit)),           nullptr,    Read(REG(Out_Rng1))},
+    {On(REG(Out_Rng1)),               nullptr,    Read(REG(Usr_Out1_Z))},
+    {On(REG(Usr_Out1_Z)),             nullptr,    Read(REG(Usr_Out1_F))},
+    {On(REG(Usr_Out1_F)),             nullptr,    Read(REG(Sig_Lmt1_Z))},
+    {On(REG(Sig_Lmt1_Z)),             nullptr,    Read(REG(Sig_Lmt1_F))},
+    {On(REG(Sig_Lmt1_F)),             nullptr,    Read(REG(Trig_Level))},
+    {On(REG(Trig_Level)),             nullptr,    Read(REG(Aux_C))},
+    {On(REG(Aux_C)),                  nullptr,    Read(REG(Aux_V))},
+    {On(REG(Aux_V)),                  nullptr,    FirstTablePart(REG(Table1))},
+    {OnTableParts(REG(Table1)),       nullptr,    Read(REG(Remote1))},
+    {On(REG(Remote1)),                decodeRead, Read(REG(Int_Temp))},
 };
 // clang-format on
 

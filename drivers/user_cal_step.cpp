@@ -65,6 +65,22 @@ bool CalibratePair(const UserRange& range, const UserPair& pair, const SettingsS
                           settings.*pair.full, work.DrvOutZ, work.DrvOutF, text);
 }
 
+bool Output1Calibration(StepContext& step, QString& text) {
+    return CalibratePair(Output1Range, Output1Range.scale, step.settings, step.work, text);
+}
+
+bool Limit1Calibration(StepContext& step, QString& text) {
+    return CalibratePair(Output1Range, Output1Range.limits, step.settings, step.work, text);
+}
+
+bool Output2Calibration(StepContext& step, QString& text) {
+    return CalibratePair(Output2Range, Output2Range.scale, step.settings, step.work, text);
+}
+
+bool Limit2Calibration(StepContext& step, QString& text) {
+    return CalibratePair(Output2Range, Output2Range.limits, step.settings, step.work, text);
+}
+
 bool ReadUserRange(const UserRange& range, const RegMap& values, SettingsSet& settings,
                    QString& warning) {
     const qint32 row = values.*range.rangeRegister;

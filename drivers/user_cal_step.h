@@ -38,6 +38,12 @@ extern const UserRange Output2Range;
 bool CalibratePair(const UserRange& range, const UserPair& pair, const SettingsSet& settings,
                    DriverWork& work, QString& text);
 
+// Step hooks: the output pairs of the record into DrvOutZ and DrvOutF.
+bool Output1Calibration(StepContext& step, QString& text);
+bool Limit1Calibration(StepContext& step, QString& text);
+bool Output2Calibration(StepContext& step, QString& text);
+bool Limit2Calibration(StepContext& step, QString& text);
+
 // The range field and the engineering pairs back from the values read. A pair
 // whose counts do not convert reads as zeros with a warning ("Out 1 ..., ").
 // False when the range register names no row; the scale pair is then zero.
