@@ -4,6 +4,7 @@
 #include "drivers/read_back.h"
 #include "drivers/step_runner.h"
 #include "drivers/user_cal_step.h"
+#include "model/range_table.h"
 
 namespace kv {
 
@@ -12,10 +13,21 @@ namespace {
 // Shared by both models: only one run is active at a time.
 DriverWork work7146v1;
 
+// The input range row is in Inp1RngTyp; the input is calibrated in its units.
+const UserRange engineeringInput{
+    Input1,
+    &RegMap::In_Rng1,
+    &SettingsSet::Inp1RngTyp,
+    nullptr,
+    {&RegMap::Usr_In1_Z, &RegMap::Usr_In1_F, &SettingsSet::Inp1EngZro, &SettingsSet::Inp1EngFul,
+     "In 1"},
+    {nullptr, nullptr, nullptr, nullptr, nullptr},
+};
+
 // --- hooks of the programming orders ---
 
 bool inputCalibration(StepContext& step, QString& text) {
-    return CalibratePair(Input1Range, Input1Range.scale, step.settings, step.work, text);
+    return CalibratePair(engineeringInput, engineeringInput.scale, step.settings, step.work, text);
 }
 
 // --- hooks of the reading orders ---
@@ -28,7 +40,7 @@ void decodeCommon(StepContext& step) {
     ReadModuleIdentity(RegVal, s);
     s.Inp1Respon = RegVal.Resp1;
     s.UserLmtEna = RegVal.Sig_Lmt_On;
-    if (!ReadUserRange(Input1Range, RegVal, s, warning))
+    if (!ReadUserRange(engineeringInput, RegVal, s, warning))
         warning += QStringLiteral("Invalid Input 1 Range, ");
     if (!ReadUserRange(Output1Range, RegVal, s, warning))
         warning += QStringLiteral("Invalid Output 1 Range");

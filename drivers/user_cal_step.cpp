@@ -6,16 +6,6 @@
 
 namespace kv {
 
-const UserRange Input1Range{
-    Input1,
-    &RegMap::In_Rng1,
-    &SettingsSet::Inp1RngTyp,
-    nullptr,
-    {&RegMap::Usr_In1_Z, &RegMap::Usr_In1_F, &SettingsSet::Inp1EngZro, &SettingsSet::Inp1EngFul,
-     "In 1"},
-    {nullptr, nullptr, nullptr, nullptr, nullptr},
-};
-
 const UserRange Output1Range{
     Output1,
     &RegMap::Out_Rng1,

@@ -28,7 +28,6 @@ struct UserRange {
     UserPair limits;  // label nullptr: the channel has no signal limits
 };
 
-extern const UserRange Input1Range;   // In_Rng1, Usr_In1_Z/F: Inp1RngTyp, Inp1EngZro/Ful
 extern const UserRange Output1Range;  // Out_Rng1 and its user counts and signal limits
 extern const UserRange Output2Range;
 
