@@ -352,6 +352,8 @@ private slots:
     void programThenReadGivesTheRecord_data();
     void programThenReadGivesTheRecord();
     void kv716RemoteOfOutput2Only();
+    void readWithoutRangesWarns_data();
+    void readWithoutRangesWarns();
     void windowRefusesAnotherFamily();
     void dispatcherChecksItsModel();
     void inputOutOfRange_data();
@@ -476,6 +478,27 @@ void TestDrv7146::kv716RemoteOfOutput2Only() {
     s.DirecrReve = 0;
     QVERIFY2(bench.program(Kv716v2Driver(), s), qPrintable(bench.result));
     QCOMPARE(bench.sim->registerValue(RegAdd.Flag_A), 0x02);
+}
+
+void TestDrv7146::readWithoutRangesWarns_data() {
+    QTest::addColumn<int>("model");
+    QTest::addColumn<QString>("warning");
+    QTest::newRow("KV716 v1") << 1 << "Invalid Input 1 Range, Invalid Output 2 Range";
+    QTest::newRow("KV716 v2") << 4 << "Invalid Output 2 Range";
+}
+
+void TestDrv7146::readWithoutRangesWarns() {
+    QFETCH(int, model);
+    const ModelCase& m = modelCases[model];
+    drvbench::Bench bench(m.typeCode, m.subType);
+    QVERIFY(bench.ready());
+    const RegMap map = RegMapFor(m.driver().family);
+    bench.sim->setRegisterValue(map.In_Rng1, 17);
+    bench.sim->setRegisterValue(map.Out_Rng2, -1);
+    QVERIFY2(bench.read(m.driver(), m.record()), qPrintable(bench.result));
+    QTEST(bench.run.warning(), "warning");
+    QCOMPARE(bench.run.settings().Out2RngTyp, -1);
+    QCOMPARE(bench.run.settings().Out2EngFul, 0.0f);
 }
 
 void TestDrv7146::windowRefusesAnotherFamily() {

@@ -185,6 +185,7 @@ private slots:
     void programmingRunFollowsTheOrder();
     void programThenReadGivesTheRecord_data();
     void programThenReadGivesTheRecord();
+    void readWithoutAnOutputRangeWarns();
     void wrongModelStopsAtTheFirstStep();
     void inputCalibrationFailureStopsBeforeAnyWrite_data();
     void inputCalibrationFailureStopsBeforeAnyWrite();
@@ -563,6 +564,18 @@ void TestDrv718::programThenReadGivesTheRecord() {
     QCOMPARE(back.Out1SigLmZ, s.Out1SigLmZ);
     QCOMPARE(back.Out1SigLmF, s.Out1SigLmF);
     QVERIFY(back.Table1 == s.Table1);
+}
+
+void TestDrv718::readWithoutAnOutputRangeWarns() {
+    drvbench::Bench bench(Kv718Type, 3);
+    QVERIFY(bench.ready());
+    bench.sim->setRegisterValue(RegMapFor(Kv718Map).Out_Rng1, 40);
+    QVERIFY2(bench.read(Kv718Driver(), SettingsSet()), qPrintable(bench.result));
+    QCOMPARE(bench.run.warning(), QString("Invalid Output 1 Range"));
+    QCOMPARE(bench.run.settings().Out1RngTyp, 40);
+    // The rest of the record is read as usual.
+    QCOMPARE(bench.run.settings().Inp1MeUnit, QString("V"));
+    QCOMPARE(bench.run.settings().Inp1Samples, 0);  // factory ST_Samples 1
 }
 
 void TestDrv718::wrongModelStopsAtTheFirstStep() {

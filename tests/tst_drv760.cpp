@@ -186,6 +186,7 @@ private slots:
     void programmingRunFollowsTheOrder();
     void programThenReadGivesTheRecord_data();
     void programThenReadGivesTheRecord();
+    void readWithoutAnOutputRangeWarns();
     void wrongModelStopsAtTheFirstStep();
     void refusedInputStopsBeforeAnyWrite();
     void outputOutOfRangeNamesTheRegister();
@@ -543,6 +544,18 @@ void TestDrv760::programThenReadGivesTheRecord() {
     QCOMPARE(back.Out1SigLmF, s.Out1SigLmF);
     QCOMPARE(back.Out1EngUnt, QString("mA"));
     QVERIFY(back.Table1 == s.Table1);
+}
+
+void TestDrv760::readWithoutAnOutputRangeWarns() {
+    drvbench::Bench bench(Kv760Type, 0);
+    QVERIFY(bench.ready());
+    bench.sim->setRegisterValue(RegMapFor(Kv760Map).Out_Rng1, 17);
+    SettingsSet before = kv760Record();
+    QVERIFY2(bench.read(Kv760Driver(), before), qPrintable(bench.result));
+    QCOMPARE(bench.run.warning(), QString("Invalid Output 1 Range, "));
+    QCOMPARE(bench.run.settings().Out1RngTyp, 17);
+    QCOMPARE(bench.run.settings().Out1EngZro, 0.0f);
+    QCOMPARE(bench.run.settings().Out1EngFul, 0.0f);
 }
 
 void TestDrv760::wrongModelStopsAtTheFirstStep() {
