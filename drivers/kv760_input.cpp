@@ -23,8 +23,8 @@ constexpr double CountsPerVolt = 9930;
 
 constexpr int FlagLoading = 2;  // bits 0 and 1 hold the trigger band
 
-// Trigger sensitivity bands, most sensitive first; a level up to `upTo` (and
-// below `below` for the middle band) takes the band.
+// Trigger sensitivity bands and the count gain of each. A level up to
+// SensitiveUpTo takes the most sensitive band, one below MiddleBelow the middle one.
 struct TriggerBand {
     quint16 bits;
     double gain;
