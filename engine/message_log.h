@@ -12,8 +12,8 @@ namespace kv {
 // Debug-panel options: which lines reach the log.
 enum LogOption { LogSend = 0, LogReceive = 1, LogGeneral = 2, LogSerialSteps = 3, LogDescribe = 4 };
 
-constexpr int LogLimit = 30000;       // characters kept before the oldest are dropped
-constexpr int LogDropped = 999;       // characters dropped at a time
+constexpr int LogLimit = 30000;  // characters kept before the oldest are dropped
+constexpr int LogDropped = 999;  // characters dropped at a time
 constexpr int StatusVisibleTicks = 301;
 
 class MessageLog : public QObject, public DiagnosticSink {

@@ -44,11 +44,11 @@ public:
     void cbSet(qint32 address, qint16 busId, const QString& text, bool ok) override;
 
 signals:
-    void startUpTick();               // a tick while the program is still starting up
-    void ticked();                    // a tick of the running program (status counter)
+    void startUpTick();  // a tick while the program is still starting up
+    void ticked();       // a tick of the running program (status counter)
     void moduleTextChanged(const QString& model);
-    void moduleControlsChanged();     // ModuleMap changed: the live panel rebuilds
-    void runMode();                   // identification finished
+    void moduleControlsChanged();  // ModuleMap changed: the live panel rebuilds
+    void runMode();                // identification finished
     void waitBox(bool show, const QString& text);
     void beep();
 
