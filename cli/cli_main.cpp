@@ -1,6 +1,5 @@
 // kv700-cli: the headless front end for production benches.
 #include "cli/cli_args.h"
-#include "cli/cli_output.h"
 #include "cli/cli_run.h"
 
 #include <QCoreApplication>
@@ -15,10 +14,6 @@ int main(int argc, char* argv[]) {
                              kv::cli::UsageText();
         std::fputs(text.toUtf8().constData(), stderr);
         return kv::cli::ExitUsage;
-    }
-    if (parsed.request.command == kv::cli::Command::Help) {
-        kv::cli::PrintResult(kv::cli::UsageText());
-        return kv::cli::ExitSuccess;
     }
     return kv::cli::RunCommand(parsed.request);
 }

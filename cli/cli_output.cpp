@@ -42,7 +42,7 @@ void StderrSink::endProgress() {
     lineOpen_ = false;
 }
 
-void StderrSink::failure(const QString& text) {
+void StderrSink::notice(const QString& text) {
     const bool shown = text == lastProgress_;
     endProgress();
     if (!shown)

@@ -20,8 +20,8 @@ public:
     // (the probe and the self-test, which report through their result).
     void setProgressShown(bool on) { progressShown_ = on; }
     void progress(const QString& text);
-    // Ends the progress line and writes the failure text on its own line.
-    void failure(const QString& text);
+    // Ends the progress line and writes a failure or a warning on its own line.
+    void notice(const QString& text);
     // A line that only --verbose shows.
     void verboseLine(const QString& text);
     void endProgress();

@@ -6,6 +6,7 @@
 #include "cli/cli_probe.h"
 #include "cli/cli_registers.h"
 #include "cli/cli_session.h"
+#include "cli/cli_settings_runs.h"
 #include "serial/adapter_test.h"
 
 namespace kv::cli {
@@ -16,7 +17,14 @@ struct Context {
     const CliRequest& request;
     const PortChoice& port;
     StderrSink& sink;
+    qint32 fileType = 0;  // program: the loaded file's module type and settings
+    SettingsSet fileSettings;
 };
+
+bool help(Context&, QString& result, QString&) {
+    result = UsageText();
+    return true;
+}
 
 bool probe(Context& context, QString& result, QString&) {
     result = ProbePorts(context.port.connector());
@@ -49,6 +57,20 @@ bool set(Context& context, ModuleSession& session, QString& result, QString& err
     return SetRegister(session, context.request, result, error);
 }
 
+bool loadProgramFile(Context& context, QString& error) {
+    return LoadSettingsFile(context.request.file, context.fileType, context.fileSettings, error);
+}
+
+bool program(Context& context, ModuleSession& session, QString& result, QString& error) {
+    return ProgramModule(session, context.sink, context.fileType, context.fileSettings, result,
+                         error);
+}
+
+bool read(Context& context, ModuleSession& session, QString& result, QString& error) {
+    return ReadModule(session, context.sink, context.request.file, result, error);
+}
+
+using Preparation = bool (*)(Context&, QString&);
 using PortCommand = bool (*)(Context&, QString&, QString&);
 using ModuleCommand = bool (*)(Context&, ModuleSession&, QString&, QString&);
 
@@ -56,13 +78,29 @@ struct CommandRun {
     Command command;
     PortCommand onPort;      // works on the port directly
     ModuleCommand onModule;  // works through the engine on the identified module
+    Preparation before;      // runs before the port is touched
 };
 
+// clang-format off
 const CommandRun commandRuns[] = {
-    {Command::Probe, probe, nullptr},       {Command::SelfTest, selfTest, nullptr},
-    {Command::Identify, nullptr, identify}, {Command::Regs, nullptr, regs},
-    {Command::Get, nullptr, get},           {Command::Set, nullptr, set},
+    {Command::Help,     help,     nullptr,  nullptr},
+    {Command::Probe,    probe,    nullptr,  nullptr},
+    {Command::SelfTest, selfTest, nullptr,  nullptr},
+    {Command::Identify, nullptr,  identify, nullptr},
+    {Command::Regs,     nullptr,  regs,     nullptr},
+    {Command::Get,      nullptr,  get,      nullptr},
+    {Command::Set,      nullptr,  set,      nullptr},
+    {Command::Read,     nullptr,  read,     nullptr},
+    {Command::Program,  nullptr,  program,  loadProgramFile},
 };
+// clang-format on
+
+const CommandRun& runFor(Command command) {
+    for (const CommandRun& row : commandRuns)
+        if (row.command == command)
+            return row;
+    return commandRuns[0];  // every command has its row; help is the harmless answer
+}
 
 bool runOnModule(Context& context, ModuleCommand command, QString& result, QString& error) {
     ModuleSession session(context.port.port(), context.port.connector());
@@ -80,26 +118,18 @@ int RunCommand(const CliRequest& request) {
     PortChoice port;
     QString result;
     QString error;
-    bool ok = port.resolve(request, error);
-    if (ok) {
-        Context context{request, port, sink};
-        const CommandRun* run = nullptr;
-        for (const CommandRun& row : commandRuns)
-            if (row.command == request.command)
-                run = &row;
-        if (!run) {
-            error = QStringLiteral("This command is not available yet");
-            ok = false;
-        } else if (run->onPort) {
-            sink.setProgressShown(request.verbose);
-            ok = run->onPort(context, result, error);
-        } else {
-            ok = runOnModule(context, run->onModule, result, error);
-        }
+    Context context{request, port, sink, 0, {}};
+    const CommandRun& run = runFor(request.command);
+    bool ok = (!run.before || run.before(context, error)) && port.resolve(request, error);
+    if (ok && run.onPort) {
+        sink.setProgressShown(request.verbose);
+        ok = run.onPort(context, result, error);
+    } else if (ok) {
+        ok = runOnModule(context, run.onModule, result, error);
     }
     sink.endProgress();
     if (!ok) {
-        sink.failure(error);
+        sink.notice(error);
         return ExitFailure;
     }
     PrintResult(result);

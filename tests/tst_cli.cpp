@@ -3,13 +3,17 @@
 #include "cli/cli_probe.h"
 #include "cli/cli_registers.h"
 #include "model/codec.h"
+#include "model/module_types.h"
 #include "model/register_map.h"
+#include "sim/simulator.h"
 
 #include <QProcess>
+#include <QTemporaryDir>
 #include <QtTest>
 
 using namespace kv;
 using namespace kv::cli;
+using namespace kv::sim;
 
 Q_DECLARE_METATYPE(kv::cli::Command)
 
@@ -36,11 +40,81 @@ Run runCli(const QStringList& arguments, const QProcessEnvironment& environment 
     run.err = QString::fromUtf8(process.readAllStandardError());
     return run;
 }
+
+constexpr int Kv720Map = 3;
+
+// One simulated module published as a COM port of its own for one test.
+class SimPort {
+public:
+    explicit SimPort(const ModuleIdentity& module = {}, int adapter = 0)
+        : sim(optionsFor(module, adapter)), port(nextPort++) {
+        QString error;
+        ok = sim.start(error) && sim.publishAsPort(port, error);
+        if (!ok)
+            qWarning() << "simulator:" << error;
+    }
+    // The command line of kv700-cli for this port.
+    QStringList args(const QStringList& command) const {
+        return QStringList{"--port", QString::number(port)} + command;
+    }
+    int writesSeen() const {
+        int writes = 0;
+        for (const SimLogEntry& entry : sim.log())
+            writes += entry.kind == SimLogEntry::Request && entry.command == 'W';
+        return writes;
+    }
+
+    Simulator sim;
+    int port;
+    bool ok = false;
+
+private:
+    static SimOptions optionsFor(const ModuleIdentity& module, int adapter) {
+        SimOptions options;
+        options.module = module;
+        options.adapter = adapter;
+        return options;
+    }
+    static inline int nextPort = 1;
+};
+
+ModuleIdentity kv720(qint32 serial) {
+    ModuleIdentity module;
+    module.typeCode = 4;  // KV720-20
+    module.serial = serial;
+    module.revision = 0x0203;
+    module.busId = 5;
+    return module;
+}
+
+int kv720Address(qint32 RegMap::*member) {
+    return RegMapFor(Kv720Map).*member;
+}
+
+// The text of a .kv7 file with one `"key",value` line replaced.
+QByteArray withLine(const QByteArray& file, const QByteArray& key, const QByteArray& value) {
+    QList<QByteArray> lines = file.split('\n');
+    for (QByteArray& line : lines)
+        if (line.startsWith('"' + key + "\","))
+            line = '"' + key + "\"," + value + '\r';
+    return lines.join('\n');
+}
+
+QByteArray readFile(const QString& name) {
+    QFile file(name);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+bool writeFile(const QString& name, const QByteArray& bytes) {
+    QFile file(name);
+    return file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size();
+}
 }  // namespace
 
 class TestCli : public QObject {
     Q_OBJECT
 private slots:
+    void initTestCase();
     void parsesCommands_data();
     void parsesCommands();
     void usageErrors_data();
@@ -51,7 +125,30 @@ private slots:
     void probeEntries();
     void setRefusesWhatTheViewerRefuses();
     void valuesDecodedByTheMap();
+
+    void identifyPrintsTheModule();
+    void deviceNamedDirectly();
+    void getAndSetRoundTrip();
+    void setRefusesAFloatWithoutFloat();
+    void regsListsTheMap();
+    void probeListsTheSimulatedPort();
+    void selfTestOfAPrimedAdapter();
+    void missingPortFails();
+    void refusedRequestFails();
+    void readThenProgramRoundTrip();
+    void programRefusesAnotherModel();
+    void programRefusesAnUnreadableFile();
+
+private:
+    QTemporaryDir ports_;
+    QTemporaryDir files_;
 };
+
+void TestCli::initTestCase() {
+    QVERIFY(ports_.isValid() && files_.isValid());
+    // The simulators publish their ports here, and kv700-cli inherits it.
+    qputenv("KV700_PORT_DIR", QFile::encodeName(ports_.path()));
+}
 
 void TestCli::parsesCommands_data() {
     QTest::addColumn<QStringList>("arguments");
@@ -219,6 +316,195 @@ void TestCli::valuesDecodedByTheMap() {
     QCOMPARE(DataAndValue(engineering, 20, LongToWire(77)),
              QString::fromLatin1(LongToWire(77)) + "\t77\n");
     SetRegMap(RegAdd, NoModuleMap);
+}
+
+void TestCli::identifyPrintsTheModule() {
+    SimPort module(kv720(123457));
+    QVERIFY(module.ok);
+    const Run run = runCli(module.args({"identify"}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(run.out, QStringLiteral("Model\tKV720-20\nSerial number\t123457\nRevision\t2.003\n"
+                                     "Bus ID\t5\n"));
+    QVERIFY(run.err.contains("Run Mode"));
+}
+
+void TestCli::deviceNamedDirectly() {
+    SimPort module(kv720(200002));
+    QVERIFY(module.ok);
+    const Run run = runCli({"--device", module.sim.slavePath(), "identify"});
+    QCOMPARE(run.exitCode, 0);
+    QVERIFY2(run.out.contains("Serial number\t200002\n"), qPrintable(run.out));
+}
+
+void TestCli::getAndSetRoundTrip() {
+    SimPort module(kv720(100010));
+    QVERIFY(module.ok);
+    const int zero = kv720Address(&RegMap::Usr_Out1_Z);
+    Run run = runCli(module.args({"set", QString::number(zero), "-1234"}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(run.out, QString::fromLatin1(LongToWire(-1234)) + "\t-1234\n");
+    QCOMPARE(module.sim.registerValue(zero), -1234);
+
+    module.sim.setRegisterValue(zero, 4321);
+    run = runCli(module.args({"get", QString::number(zero)}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(run.out, QString::fromLatin1(LongToWire(4321)) + "\t4321\n");
+
+    const int engineering = qRound(RegMapFor(Kv720Map).Eng_In_Z);
+    run = runCli(module.args({"set", QString::number(engineering), "2.5", "--float"}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(run.out, QString::fromLatin1(SingleToWire(2.5f)) + "\t2.5\n");
+    QCOMPARE(module.sim.registerValue(engineering), WireToLong(SingleToWire(2.5f)));
+}
+
+void TestCli::setRefusesAFloatWithoutFloat() {
+    SimPort module(kv720(100011));
+    QVERIFY(module.ok);
+    const int engineering = qRound(RegMapFor(Kv720Map).Eng_In_Z);
+    const qint32 before = module.sim.registerValue(engineering);
+    const Run run = runCli(module.args({"set", QString::number(engineering), "3"}));
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QVERIFY(run.err.endsWith(
+        QStringLiteral("Register %1 holds a floating value: give --float\n").arg(engineering)));
+    QCOMPARE(module.sim.registerValue(engineering), before);
+    QCOMPARE(module.writesSeen(), 0);
+}
+
+void TestCli::regsListsTheMap() {
+    SimPort module(kv720(100012));
+    QVERIFY(module.ok);
+    const int serial = kv720Address(&RegMap::Serial_No);
+    const Run run = runCli(module.args({"regs"}));
+    QCOMPARE(run.exitCode, 0);
+    QStringList lines = run.out.split('\n');
+    QCOMPARE(lines.takeLast(), QString());
+    QCOMPARE(lines.takeFirst(), QStringLiteral("Add\tValue\tDescription"));
+    const RegMap map = RegMapFor(Kv720Map);
+    // Every address of the image, then the power and type registers.
+    QCOMPARE(lines.size(), map.Highest_Reg - map.Lowest_Reg + 1 + 2);
+    QCOMPARE(lines.first().section('\t', 0, 0).toInt(), map.Lowest_Reg);
+    QCOMPARE(lines.last(), QStringLiteral("255\t4\tModule Type"));
+    QVERIFY(
+        lines.contains(QStringLiteral("%1\t100012\tSerial number").arg(serial, 3, 10, QChar('0'))));
+    // Each listed register was read again at bus ID 16; identification reads
+    // with its phase marks instead.
+    QSet<int> readAt16;
+    for (const SimLogEntry& entry : module.sim.log())
+        if (entry.kind == SimLogEntry::Request && entry.command == 'R' && entry.busId == 16)
+            readAt16 << entry.address;
+    for (const QString& line : lines)
+        QVERIFY2(readAt16.contains(line.section('\t', 0, 0).toInt()), qPrintable(line));
+}
+
+void TestCli::probeListsTheSimulatedPort() {
+    SimPort module(kv720(100013));
+    QVERIFY(module.ok);
+    const Run run = runCli({"probe"});
+    QCOMPARE(run.exitCode, 0);
+    QVERIFY2(run.out.split('\n').contains(QStringLiteral("Com%1 KV720-20").arg(module.port)),
+             qPrintable(run.out));
+    QVERIFY(run.err.isEmpty());
+}
+
+void TestCli::selfTestOfAPrimedAdapter() {
+    SimPort primed(kv720(100014), 1);
+    QVERIFY(primed.ok);
+    Run run = runCli(primed.args({"selftest"}));
+    QCOMPARE(run.exitCode, 0);
+    QVERIFY2(run.out.startsWith("PASS KV705 !!! "), qPrintable(run.out));
+    QVERIFY(run.err.isEmpty());
+
+    // A plain adapter's output stops at once: too short a decay.
+    SimPort plain(kv720(100015), 0);
+    QVERIFY(plain.ok);
+    run = runCli(plain.args({"selftest"}));
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QVERIFY2(run.err.startsWith("FAIL KV705 decay"), qPrintable(run.err));
+}
+
+void TestCli::missingPortFails() {
+    // Port 31 has no link and no device of the built-in table.
+    Run run = runCli({"--port", "31", "identify"});
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QVERIFY2(run.err.endsWith("Communicate:% >> COM closed\n"), qPrintable(run.err));
+
+    run = runCli({"--device", files_.filePath("no-such-tty"), "get", "40"});
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QVERIFY2(run.err.endsWith("Communicate:% >> COM closed\n"), qPrintable(run.err));
+
+    run = runCli({"--port", "31", "selftest"});
+    QCOMPARE(run.exitCode, 1);
+    QCOMPARE(run.err, QStringLiteral("FAIL KV705 %\n"));
+}
+
+void TestCli::refusedRequestFails() {
+    SimPort module(kv720(100016));
+    QVERIFY(module.ok);
+    Run run = runCli(module.args({"get", "15"}));
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QVERIFY(run.err.endsWith("Address < 16 not allowed\n"));
+
+    run = runCli(module.args({"get", "40", "--id", "15"}));
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.err.endsWith("ID must be 16 or above\n"));
+}
+
+void TestCli::readThenProgramRoundTrip() {
+    SimPort module(kv720(100017));
+    QVERIFY(module.ok);
+    const QString first = files_.filePath("first");
+    Run run = runCli(module.args({"read", "--out", first}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(run.out, QStringLiteral("Saved: %1.kv7\n").arg(first));
+    QVERIFY(run.err.contains("Step 1 of "));
+    const QByteArray read = readFile(first + ".kv7");
+    QVERIFY(read.contains("\"SerialNumb\",100017\r\n"));
+
+    QByteArray edited = withLine(read, "FileName", "\"BENCH 7 PUMP        \"");
+    edited = withLine(edited, "BussIdenti", "9");
+    edited = withLine(edited, "Out1EngZro", "5");
+    QVERIFY(edited != read);
+    const QString second = files_.filePath("second.kv7");
+    QVERIFY(writeFile(second, edited));
+
+    run = runCli(module.args({"program", second}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(run.out, QStringLiteral("Programmed\n"));
+    QCOMPARE(module.sim.fileName(), QByteArray("BENCH 7 PUMP        "));
+    QCOMPARE(module.sim.registerValue(kv720Address(&RegMap::Buss_ID)), 9);
+
+    const QString third = files_.filePath("third.kv7");
+    run = runCli(module.args({"read", "--out", third}));
+    QCOMPARE(run.exitCode, 0);
+    QCOMPARE(readFile(third), edited);
+}
+
+void TestCli::programRefusesAnotherModel() {
+    SimPort module(kv720(100018));
+    QVERIFY(module.ok);
+    const QString name = files_.filePath("kv714.kv7");
+    QVERIFY(writeFile(name, "\"ModTypeSet\",1\r\n\"BussIdenti\",3\r\n"));
+    const Run run = runCli(module.args({"program", name}));
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QString expected;
+    QVERIFY(!CheckModType(1, Kv720Map, expected));
+    QVERIFY2(run.err.endsWith(expected + "\n"), qPrintable(run.err));
+    QCOMPARE(module.writesSeen(), 0);
+}
+
+void TestCli::programRefusesAnUnreadableFile() {
+    const Run run = runCli({"--port", "31", "program", files_.filePath("absent.kv7")});
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    // The file is refused before any port is tried.
+    QVERIFY2(run.err.startsWith("Failed: "), qPrintable(run.err));
+    QVERIFY(!run.err.contains("Communicate"));
 }
 
 QTEST_GUILESS_MAIN(TestCli)
