@@ -251,7 +251,7 @@ QString UsageText() {
         "  --port N       COM port number (COMn links in $KV700_PORT_DIR or the built-in table)\n"
         "  --device PATH  use this serial device as the port\n"
         "  --adapter 0|1  adapter type: 0 QTR490-02, 1 KV705-01 (priming blocks)\n"
-        "  --verbose      also write the message log and the engine tick count to stderr\n"
+        "  --verbose      also write the message log, the engine ticks and the time to stderr\n"
         "  --float        VALUE is a floating value (required for floating registers)\n"
         "\n"
         "Without --port or --device the port is COM1; without --adapter the adapter type is 0.\n"

@@ -107,7 +107,8 @@ bool runOnModule(Context& context, ModuleCommand command, QString& result, QStri
     const bool ok = session.open(error) && command(context, session, result, error);
     // Closing the connection is no progress of the run.
     context.sink.setProgressShown(false);
-    context.sink.verboseLine(QStringLiteral("Engine ticks: %1").arg(session.ticks()));
+    context.sink.verboseLine(
+        QStringLiteral("Engine ticks: %1 in %2 ms").arg(session.ticks()).arg(session.elapsedMs()));
     return ok;
 }
 

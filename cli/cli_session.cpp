@@ -67,6 +67,8 @@ bool ModuleSession::runUntil(const WaitOver& over, QString& error) {
 
 bool ModuleSession::open(QString& error) {
     runMode_ = false;
+    ticks_ = 0;
+    clock_.start();
     if (!connection_.OpenCom(true, error))
         return false;
     return runUntil(

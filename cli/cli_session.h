@@ -7,6 +7,7 @@
 #include "engine/module_connection.h"
 
 #include <QByteArray>
+#include <QElapsedTimer>
 #include <QObject>
 #include <QVariant>
 
@@ -37,8 +38,9 @@ public:
     ModuleConnection& connection() { return connection_; }
     RequestEngine& engine() { return connection_.engine(); }
     QString tag() const { return tag_; }
-    // Engine ticks since the session was made.
+    // Engine ticks, and milliseconds, since the session was opened.
     int ticks() const { return ticks_; }
+    qint64 elapsedMs() const { return clock_.elapsed(); }
 
     void cbGet(qint32 address, qint16 busId) override;
     void cbSet(qint32 address, qint16 busId, const QString& text, bool ok) override;
@@ -49,6 +51,7 @@ private:
     ModuleConnection connection_;
     QString tag_;
     int ticks_ = 0;
+    QElapsedTimer clock_;
     bool runMode_ = false;
     bool answered_ = false;
     QString answerError_;
