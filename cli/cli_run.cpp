@@ -34,10 +34,12 @@ bool probe(Context& context, QString& result, QString&) {
 bool selfTest(Context& context, QString& result, QString& error) {
     const KvSerialPort::AdapterTestOutcome outcome =
         KvSerialPort::TestAdapter(context.port.port(), KvSerialPort::AdapterTestMessage());
-    (outcome.passed ? result : error) = outcome.report;
-    if (outcome.passed)
-        result += QLatin1Char('\n');
-    return outcome.passed;
+    if (!outcome.passed) {
+        error = outcome.report;
+        return false;
+    }
+    result = outcome.report + QLatin1Char('\n');
+    return true;
 }
 
 bool identify(Context&, ModuleSession&, QString& result, QString&) {

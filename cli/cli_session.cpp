@@ -28,7 +28,7 @@ ModuleSession::ModuleSession(qint16 port, qint16 connector, QObject* parent)
 }
 
 ModuleSession::~ModuleSession() {
-    engine().setReserved(false);
+    // Disconnecting also clears the reservation.
     QString ignored;
     if (engine().connected())
         connection_.OpenCom(false, ignored);

@@ -46,8 +46,8 @@ constexpr int Kv720Map = 3;
 // One simulated module published as a COM port of its own for one test.
 class SimPort {
 public:
-    explicit SimPort(const ModuleIdentity& module = {}, int adapter = 0)
-        : sim(optionsFor(module, adapter)), port(nextPort++) {
+    explicit SimPort(const ModuleIdentity& module = {}, int adapter = 0, SimFaults faults = {})
+        : sim(optionsFor(module, adapter, faults)), port(nextPort++) {
         QString error;
         ok = sim.start(error) && sim.publishAsPort(port, error);
         if (!ok)
@@ -69,10 +69,12 @@ public:
     bool ok = false;
 
 private:
-    static SimOptions optionsFor(const ModuleIdentity& module, int adapter) {
+    static SimOptions optionsFor(const ModuleIdentity& module, int adapter,
+                                 const SimFaults& faults) {
         SimOptions options;
         options.module = module;
         options.adapter = adapter;
+        options.faults = faults;
         return options;
     }
     static inline int nextPort = 1;
@@ -135,6 +137,7 @@ private slots:
     void selfTestOfAPrimedAdapter();
     void missingPortFails();
     void refusedRequestFails();
+    void moduleGoingSilentFails();
     void readThenProgramRoundTrip();
     void programRefusesAnotherModel();
     void programRefusesAnUnreadableFile();
@@ -452,6 +455,21 @@ void TestCli::refusedRequestFails() {
     run = runCli(module.args({"get", "40", "--id", "15"}));
     QCOMPARE(run.exitCode, 1);
     QVERIFY(run.err.endsWith("ID must be 16 or above\n"));
+}
+
+void TestCli::moduleGoingSilentFails() {
+    // Identification reads the module type and the whole image; the module
+    // then answers five reads of the register list and falls silent.
+    const RegMap map = RegMapFor(Kv720Map);
+    SimFaults faults;
+    faults.deadAfter = 1 + map.Highest_Reg - map.Lowest_Reg + 1 + 5;
+    SimPort module(kv720(100019), 0, faults);
+    QVERIFY(module.ok);
+    const Run run = runCli(module.args({"regs"}));
+    QCOMPARE(run.exitCode, 1);
+    QVERIFY(run.out.isEmpty());
+    QVERIFY2(run.err.endsWith("Too many retries:\n"), qPrintable(run.err));
+    QVERIFY(run.err.contains(QStringLiteral("Register 6 of ")));
 }
 
 void TestCli::readThenProgramRoundTrip() {
