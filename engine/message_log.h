@@ -12,8 +12,8 @@ namespace kv {
 // Debug-panel options: which lines reach the log.
 enum LogOption { LogSend = 0, LogReceive = 1, LogGeneral = 2, LogSerialSteps = 3, LogDescribe = 4 };
 
-constexpr int LogLimit = 30000;       // characters kept before the oldest are dropped
-constexpr int LogDropped = 999;       // characters dropped at a time
+constexpr int LogLimit = 30000;  // characters kept before the oldest are dropped
+constexpr int LogDropped = 999;  // characters dropped at a time
 constexpr int StatusVisibleTicks = 301;
 
 class MessageLog : public QObject, public DiagnosticSink {
@@ -32,6 +32,8 @@ public:
     bool statusVisible() const { return statusVisible_; }
     // One timer tick: the status line hides after StatusVisibleTicks quiet ticks.
     void statusTick();
+    // The status line visible again for a full StatusVisibleTicks, its text unchanged.
+    void resetStatusCounter();
 
     void debugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
                       const QString& kind) override;
