@@ -53,7 +53,9 @@ void FailGeneral(const QString& procedure, const QString& tag, const QString& de
     ShowStatus(procedure + QStringLiteral(": ") + description);
 }
 
-QString StatusText() { return statusText; }
+QString StatusText() {
+    return statusText;
+}
 
 bool DebugFlag() {
     return debugFlag;

@@ -4,9 +4,13 @@
 
 namespace kv {
 
-MessageLog::MessageLog(QObject* parent) : QObject(parent) { previous_ = SetDiagnosticSink(this); }
+MessageLog::MessageLog(QObject* parent) : QObject(parent) {
+    previous_ = SetDiagnosticSink(this);
+}
 
-MessageLog::~MessageLog() { SetDiagnosticSink(previous_); }
+MessageLog::~MessageLog() {
+    SetDiagnosticSink(previous_);
+}
 
 void MessageLog::setOption(int option, bool on) {
     if (option >= 0 && option < int(options_.size()))

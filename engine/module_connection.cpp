@@ -15,7 +15,9 @@ constexpr int Kv720Map = 3;           // reads no calibration values
 constexpr int Kv716Map = 2;
 constexpr int Kv716v2Map = 5;
 
-bool defined(double address) { return address > LowestDefined; }
+bool defined(double address) {
+    return address > LowestDefined;
+}
 
 // One step of the live-polling cycle: the register read at a counter value,
 // or the fallback when the family lacks it.
@@ -26,13 +28,19 @@ struct PollStep {
 };
 
 constexpr PollStep pollCycle[] = {
-    {10, [](const RegMap& a) { return double(a.Sw_In2); }, [](const RegMap& a) { return double(a.Pulse_Valley); }},
-    {20, [](const RegMap& a) { return double(a.Sw_Out1); }, [](const RegMap& a) { return double(a.Pulse_Peak); }},
-    {30, [](const RegMap& a) { return double(a.Sw_Out2); }, [](const RegMap& a) { return double(a.Pulse_Valley_Raw); }},
-    {40, [](const RegMap& a) { return double(a.Pulse_Peak_Raw); }, [](const RegMap& a) { return double(a.Mod_Type); }},
-    {50, [](const RegMap& a) { return double(a.Trig_Level_RT); }, [](const RegMap& a) { return double(a.Serial_No); }},
+    {10, [](const RegMap& a) { return double(a.Sw_In2); },
+     [](const RegMap& a) { return double(a.Pulse_Valley); }},
+    {20, [](const RegMap& a) { return double(a.Sw_Out1); },
+     [](const RegMap& a) { return double(a.Pulse_Peak); }},
+    {30, [](const RegMap& a) { return double(a.Sw_Out2); },
+     [](const RegMap& a) { return double(a.Pulse_Valley_Raw); }},
+    {40, [](const RegMap& a) { return double(a.Pulse_Peak_Raw); },
+     [](const RegMap& a) { return double(a.Mod_Type); }},
+    {50, [](const RegMap& a) { return double(a.Trig_Level_RT); },
+     [](const RegMap& a) { return double(a.Serial_No); }},
     {60, [](const RegMap& a) { return double(a.Serial_No); }, nullptr},
-    {PollCycleEnd, [](const RegMap& a) { return double(a.Sw_In1); }, [](const RegMap& a) { return double(a.In_Freq); }},
+    {PollCycleEnd, [](const RegMap& a) { return double(a.Sw_In1); },
+     [](const RegMap& a) { return double(a.In_Freq); }},
 };
 
 // The address to poll at `counter` (already advanced), or -1 for no read.
@@ -139,7 +147,8 @@ void ModuleConnection::cbGet(qint32 address, qint16 busId) {
         if (address == RegAdd.Mod_Type)
             onModuleType();
         else
-            failIdentification(QStringLiteral("Unknown address:%1 Rturn ID%2").arg(address).arg(busId));
+            failIdentification(
+                QStringLiteral("Unknown address:%1 Rturn ID%2").arg(address).arg(busId));
         return;
     case PhaseCalibration:
         onCalibrationValue(address);
@@ -152,7 +161,8 @@ void ModuleConnection::cbGet(qint32 address, qint16 busId) {
         // and on the live display; nothing failed.
         return;
     default:
-        failIdentification(QStringLiteral("cbGet Unknown address:%1 Rturn ID%2").arg(address).arg(busId));
+        failIdentification(
+            QStringLiteral("cbGet Unknown address:%1 Rturn ID%2").arg(address).arg(busId));
     }
 }
 
@@ -202,10 +212,12 @@ void ModuleConnection::onCalibrationValue(qint32 address) {
         RangeTable& table = ProgramRangeTable(info.channel);
         ShowStatus(ChannelPrefix(info.channel) + table[info.range].description);
         const qint32 count = WireToLong(engine_.lastReplyData());
-        qint32 RangeDescriptor::*end = info.oddHalf ? &RangeDescriptor::countMax : &RangeDescriptor::countMin;
+        qint32 RangeDescriptor::*end =
+            info.oddHalf ? &RangeDescriptor::countMax : &RangeDescriptor::countMin;
         table[info.range].*end = count;
         // The loop-powered 4-20 mA input shares the counts of the plain one.
-        if (info.channel == Input1 && info.range == 3 && (ModuleMap == Kv716Map || ModuleMap == Kv716v2Map))
+        if (info.channel == Input1 && info.range == 3 &&
+            (ModuleMap == Kv716Map || ModuleMap == Kv716v2Map))
             table[4].*end = count;
     }
     if (address < RegAdd.Rng_Last) {
@@ -219,7 +231,8 @@ void ModuleConnection::onCalibrationValue(qint32 address) {
 
 void ModuleConnection::onRegisterUpdate(qint32 address) {
     if (address != engine_.awaitedAddress()) {
-        failIdentification(QStringLiteral("cbGet address:%1 Return ID%2").arg(address).arg(PhaseUpdate));
+        failIdentification(
+            QStringLiteral("cbGet address:%1 Return ID%2").arg(address).arg(PhaseUpdate));
         return;
     }
     if (address < RegAdd.Highest_Reg) {

@@ -39,8 +39,8 @@ quint32 charCode(const QVariant& value) {
     return text.isEmpty() ? 0u : quint32(quint8(text.at(0).toLatin1()));
 }
 
-QByteArray dataField(const QVariant& v1, const QVariant& v2, const QVariant& v3,
-                     const QVariant& v4, qint16 valueType) {
+QByteArray dataField(const QVariant& v1, const QVariant& v2, const QVariant& v3, const QVariant& v4,
+                     qint16 valueType) {
     switch (valueType) {
     case ValueLong:
     case ValueLongToo:
@@ -178,8 +178,8 @@ bool RequestEngine::W_DataOK(qint32 address, qint16 busId, const QString& tag, c
                              const QVariant& v2, const QVariant& v3, const QVariant& v4,
                              qint16 valueType, const QString& command, QString& error) {
     QString why = refusal(address);
-    const bool validCommand = command.isEmpty() || command == QLatin1String("W") ||
-                              command == QLatin1String("T");
+    const bool validCommand =
+        command.isEmpty() || command == QLatin1String("W") || command == QLatin1String("T");
     if (why.isEmpty() && !validCommand)
         why = command + QStringLiteral("? Retry Control");
     if (!why.isEmpty()) {
@@ -203,8 +203,10 @@ bool RequestEngine::W_DelayCB(qint32 address, const QVariant& value, qint16 valu
         refuse(QStringLiteral("R_CB"), why, error);
         return false;
     }
-    const bool typed = valueType == ValueLong || valueType == ValueSingle || valueType == ValueLongToo;
-    const QByteArray data = typed ? dataField(value, {}, {}, {}, valueType) : QByteArray("00000000");
+    const bool typed =
+        valueType == ValueLong || valueType == ValueSingle || valueType == ValueLongToo;
+    const QByteArray data =
+        typed ? dataField(value, {}, {}, {}, valueType) : QByteArray("00000000");
     delayedWrite_ = message('W', LowestBusId, address, data);
     delayedRead_ = readMessage(address, LowestBusId);
     awaitedAddress_ = address;
@@ -498,7 +500,8 @@ QString RequestEngine::GetSentMessageTXT(const QByteArray& msg) const {
     text += QStringLiteral("%1 ").arg(quint8(msg[1]), 3, 10, QLatin1Char('0'));
     text += GetRegDescription(address, quint8(msg[1]));
     if (state_ == StateUnknownModule)
-        DebugMessage(DiagGeneral, QStringLiteral("GetSendMessageTXT"), QStringLiteral("? Module Run"));
+        DebugMessage(DiagGeneral, QStringLiteral("GetSendMessageTXT"),
+                     QStringLiteral("? Module Run"));
     return text;
 }
 

@@ -46,8 +46,8 @@ enum ValueType : qint16 {
 };
 
 constexpr int MaxAttempts = 6;
-constexpr int DelayStart = 100;    // delay counter once the write half has gone out
-constexpr int DelayReadTick = 106; // the read half goes out on this count
+constexpr int DelayStart = 100;     // delay counter once the write half has gone out
+constexpr int DelayReadTick = 106;  // the read half goes out on this count
 
 class RequestEngine : public QObject {
     Q_OBJECT

@@ -21,7 +21,9 @@ struct Recorder : CallbackReceiver {
         bool ok;
     };
     std::vector<Call> calls;
-    void cbGet(qint32 address, qint16 busId) override { calls.push_back({"get", address, busId, {}, true}); }
+    void cbGet(qint32 address, qint16 busId) override {
+        calls.push_back({"get", address, busId, {}, true});
+    }
     void cbSet(qint32 address, qint16 busId, const QString& text, bool ok) override {
         calls.push_back({"set", address, busId, text, ok});
     }
@@ -182,18 +184,23 @@ void TestEngine::writeThenDelayedRead() {
     QCOMPARE(recorder_.calls[0].address, 30);
     QCOMPARE(engine_->delayCounter(), qint16(0));  // handed back to the live polling
     const QList<QByteArray> frames = framesSeen(*peer_);
-    QCOMPARE(frames.value(0), QByteArray("W\x10\x1E" "0000002:"));
-    QCOMPARE(frames.value(1), QByteArray("R\x10\x1E" "30303030"));
+    QCOMPARE(frames.value(0), QByteArray("W\x10\x1E"
+                                         "0000002:"));
+    QCOMPARE(frames.value(1), QByteArray("R\x10\x1E"
+                                         "30303030"));
 }
 
 void TestEngine::writeDataFields_data() {
     QTest::addColumn<qint16>("type");
     QTest::addColumn<QVariantList>("values");
     QTest::addColumn<QByteArray>("data");
-    QTest::newRow("long") << qint16(ValueLong) << QVariantList{-2, 0, 0, 0} << QByteArray("??????" "?>");
-    QTest::newRow("long rounds half to even") << qint16(ValueLongToo) << QVariantList{2.5, 0, 0, 0}
-                                              << QByteArray("00000002");
-    QTest::newRow("single") << qint16(ValueSingle) << QVariantList{1.0, 0, 0, 0} << QByteArray("3?800000");
+    QTest::newRow("long") << qint16(ValueLong) << QVariantList{-2, 0, 0, 0}
+                          << QByteArray("??????"
+                                        "?>");
+    QTest::newRow("long rounds half to even")
+        << qint16(ValueLongToo) << QVariantList{2.5, 0, 0, 0} << QByteArray("00000002");
+    QTest::newRow("single") << qint16(ValueSingle) << QVariantList{1.0, 0, 0, 0}
+                            << QByteArray("3?800000");
     QTest::newRow("two words") << qint16(ValueTwoWords) << QVariantList{0x1234, 0xFFFF, 0, 0}
                                << QByteArray("1234????");
     QTest::newRow("four chars") << qint16(ValueFourChars) << QVariantList{"A", "b", " ", "x"}

@@ -2,20 +2,13 @@
 #include "model/module_ranges.h"
 #include "model/module_types.h"
 #include "model/register_map.h"
+#include "tests/support/diagnostic_capture.h"
 
 #include <QtTest>
 
 using namespace kv;
 
 namespace {
-struct RecordingSink : DiagnosticSink {
-    QStringList lines;
-    void debugMessage(int, const QString& tag, const QString& text, const QByteArray&,
-                      const QString&) override {
-        lines << tag + ":" + text;
-    }
-    void addMessage(const QString& text) override { lines << text; }
-};
 
 struct LayoutFormula {
     QList<int> maps;
@@ -44,7 +37,6 @@ class TestModuleTypes : public QObject {
     Q_OBJECT
 private slots:
     void init();
-    void cleanup();
 
     void modelTexts_data();
     void modelTexts();
@@ -63,18 +55,13 @@ private slots:
     void rangeTableForSettingsLists();
 
 private:
-    RecordingSink sink;
+    DiagnosticCapture sink;
 };
 
 void TestModuleTypes::init() {
-    sink.lines.clear();
-    SetDiagnosticSink(&sink);
+    sink.entries.clear();
     RegVal = RegMap();
     ModuleMap = NoModuleMap;
-}
-
-void TestModuleTypes::cleanup() {
-    SetDiagnosticSink(nullptr);
 }
 
 void TestModuleTypes::modelTexts_data() {
@@ -111,14 +98,14 @@ void TestModuleTypes::displayUsesReadSubType() {
     ModuleMap = 4;
     QCOMPARE(DisplayModuleType(7), QString("KV714/8-5"));
     QCOMPARE(ModuleMap, 4);
-    QVERIFY(sink.lines.isEmpty());
+    QVERIFY(sink.entries.isEmpty());
 }
 
 void TestModuleTypes::unknownTypeMarksModuleUnknown() {
     ModuleMap = 3;
     QCOMPARE(DisplayModuleType(42), QString("KV ?"));
     QCOMPARE(ModuleMap, int(UnknownModuleMap));
-    QCOMPARE(sink.lines, QStringList{"DisplayModuleType:?"});
+    QCOMPARE(sink.entries, QStringList{"DisplayModuleType:?"});
 }
 
 void TestModuleTypes::checkModType_data() {
@@ -195,7 +182,8 @@ void TestModuleTypes::spansFollowTheDocumentedNumbering() {
         for (int reg = addresses.Rng_First; reg <= addresses.Rng_Last; ++reg) {
             const LayoutFormula* formula = nullptr;
             for (const LayoutFormula& f : layoutFormulas)
-                if (f.maps.contains(map) && reg >= f.firstReg && reg <= f.lastReg) formula = &f;
+                if (f.maps.contains(map) && reg >= f.firstReg && reg <= f.lastReg)
+                    formula = &f;
             const QByteArray where = QStringLiteral("map %1 reg %2").arg(map).arg(reg).toLatin1();
             QVERIFY2(formula, where);  // the span holds range registers only
             const RangeRegister info = GetRangeInfo(reg, map);

@@ -2,20 +2,13 @@
 #include "model/module_ranges.h"
 #include "model/register_map.h"
 #include "model/register_text.h"
+#include "tests/support/diagnostic_capture.h"
 
 #include <QtTest>
 
 using namespace kv;
 
 namespace {
-struct RecordingSink : DiagnosticSink {
-    QStringList lines;
-    void debugMessage(int, const QString& tag, const QString& text, const QByteArray&,
-                      const QString&) override {
-        lines << tag + ":" + text;
-    }
-    void addMessage(const QString& text) override { lines << text; }
-};
 
 // The program's state right after a module of the given type has been identified.
 void identify(int map, qint32 typeCode) {
@@ -31,7 +24,6 @@ class TestRegText : public QObject {
     Q_OBJECT
 private slots:
     void init();
-    void cleanup();
 
     void descriptions_data();
     void descriptions();
@@ -45,16 +37,11 @@ private slots:
     void valueTexts();
 
 private:
-    RecordingSink sink;
+    DiagnosticCapture sink;
 };
 
 void TestRegText::init() {
-    sink.lines.clear();
-    SetDiagnosticSink(&sink);
-}
-
-void TestRegText::cleanup() {
-    SetDiagnosticSink(nullptr);
+    sink.entries.clear();
 }
 
 void TestRegText::descriptions_data() {
@@ -90,7 +77,7 @@ void TestRegText::descriptions() {
     QFETCH(QString, text);
     identify(map, 0);
     QCOMPARE(GetRegDescription(address, id), text);
-    QCOMPARE(sink.lines, QStringList());
+    QCOMPARE(sink.entries, QStringList());
 }
 
 void TestRegText::undefinedAddressInEveryMap() {
@@ -103,11 +90,11 @@ void TestRegText::undefinedAddressInEveryMap() {
 void TestRegText::unknownAddressIsLogged() {
     identify(1, 1);
     QCOMPARE(GetRegDescription(200, 16), QString("Address200"));
-    QCOMPARE(sink.lines, QStringList{"GetRegDescription: Address200"});
+    QCOMPARE(sink.entries, QStringList{"GetRegDescription: Address200"});
     identify(0, 0);
-    sink.lines.clear();
+    sink.entries.clear();
     QCOMPARE(GetRegDescription(16, 16), QString("Address16"));  // no module: no range span
-    QCOMPARE(sink.lines, QStringList{"GetRegDescription: Address16"});
+    QCOMPARE(sink.entries, QStringList{"GetRegDescription: Address16"});
 }
 
 void TestRegText::pulseRegistersNamedOnlyForPulseModules() {
@@ -122,13 +109,13 @@ void TestRegText::pulseRegistersNamedOnlyForPulseModules() {
 void TestRegText::rangeDescriptionOutsideSpan() {
     identify(3, 4);
     QCOMPARE(GetRangeDescription(80), QString("Output 1: 0--1mA"));
-    QVERIFY(sink.lines.isEmpty());
+    QVERIFY(sink.entries.isEmpty());
     QCOMPARE(GetRangeDescription(71), QString("Unknown Range at 71"));
-    QCOMPARE(sink.lines, QStringList{"GetRangeDescription: Address71"});
-    sink.lines.clear();
+    QCOMPARE(sink.entries, QStringList{"GetRangeDescription: Address71"});
+    sink.entries.clear();
     ModuleMap = 6;  // the addresses of map 3 read with the range layout of map 6
     QCOMPARE(GetRangeDescription(80), QString("Unknown Range at 80"));
-    QVERIFY(sink.lines.isEmpty());
+    QVERIFY(sink.entries.isEmpty());
 }
 
 void TestRegText::everyRegisterDescribesByItsRow() {
@@ -137,14 +124,17 @@ void TestRegText::everyRegisterDescribesByItsRow() {
         identify(map, map == 6 ? 9 : 1);
         for (const RegisterRow& row : AllRegisters()) {
             const int address = row.addressIn(map);
-            if (!row.isRegister() || address < 0) continue;
+            if (!row.isRegister() || address < 0)
+                continue;
             QString expected = row.description;
-            if (row.role == RegRole::TablePart) expected += "5";
-            if (row.role == RegRole::FileNamePart) expected += "20";
+            if (row.role == RegRole::TablePart)
+                expected += "5";
+            if (row.role == RegRole::FileNamePart)
+                expected += "20";
             QCOMPARE(GetRegDescription(address, 20), expected);
         }
     }
-    QVERIFY(sink.lines.isEmpty());
+    QVERIFY(sink.entries.isEmpty());
 }
 
 void TestRegText::valueTexts_data() {

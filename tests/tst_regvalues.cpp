@@ -2,21 +2,11 @@
 #include "model/codec.h"
 #include "model/register_map.h"
 #include "model/register_values.h"
+#include "tests/support/diagnostic_capture.h"
 
 #include <QtTest>
 
 using namespace kv;
-
-namespace {
-struct RecordingSink : DiagnosticSink {
-    QStringList lines;
-    void debugMessage(int, const QString& tag, const QString& text, const QByteArray&,
-                      const QString&) override {
-        lines << tag + ":" + text;
-    }
-    void addMessage(const QString& text) override { lines << text; }
-};
-}  // namespace
 
 class TestRegValues : public QObject {
     Q_OBJECT
@@ -41,18 +31,16 @@ private slots:
     void engineeringUnitText();
 
 private:
-    RecordingSink sink;
+    DiagnosticCapture sink;
 };
 
 void TestRegValues::init() {
-    sink.lines.clear();
-    SetDiagnosticSink(&sink);
+    sink.entries.clear();
     SetRegMap(RegAdd, 0);
     SetRegMap(RegAdd, 3);
 }
 
 void TestRegValues::cleanup() {
-    SetDiagnosticSink(nullptr);
     SetModuleCaptionHandler(nullptr);
 }
 
@@ -69,7 +57,7 @@ void TestRegValues::ordinaryMembers() {
     QCOMPARE(RegVal.in_ch, qint16(0x102));
     QVERIFY(!UpdateRegValue(RegAdd.Mod_Type, "00000004", 16, 0));
     QCOMPARE(RegVal.Mod_Type, 4);
-    QVERIFY(sink.lines.isEmpty());
+    QVERIFY(sink.entries.isEmpty());
 }
 
 void TestRegValues::statusOtherThanZeroStoresNothing() {
@@ -81,7 +69,7 @@ void TestRegValues::malformedDataStoresNothing() {
     QVERIFY(UpdateRegValue(RegAdd.Table1, "0001", 16, 0));
     QCOMPARE(RegVal.Table1, -1);
     QCOMPARE(RegVal.Table1_Pts[0], -1);
-    QCOMPARE(sink.lines.size(), 1);
+    QCOMPARE(sink.entries.size(), 1);
 }
 
 void TestRegValues::inputReadingIsSixteenBits() {
@@ -98,8 +86,8 @@ void TestRegValues::overflowLeavesMemberUnchanged() {
     UpdateRegValue(RegAdd.TypInput, "00000002", 16, 0);
     QVERIFY(UpdateRegValue(RegAdd.TypInput, "00010000", 16, 0));
     QCOMPARE(RegVal.TypInput, qint16(2));
-    QCOMPARE(sink.lines.size(), 2);
-    QVERIFY(sink.lines.at(0).startsWith("UpdateRegValue:"));
+    QCOMPARE(sink.entries.size(), 2);
+    QVERIFY(sink.entries.at(0).startsWith("UpdateRegValue:"));
 }
 
 void TestRegValues::tableParts_data() {
@@ -141,7 +129,7 @@ void TestRegValues::tablePartIdsOutsideTheTable() {
     QFETCH(int, id);
     QVERIFY(UpdateRegValue(tableC ? RegAdd.TableC : RegAdd.Table1, "27102904", id, 0));
     QCOMPARE(tableC ? RegVal.TableC : RegVal.Table1, -1);
-    QCOMPARE(sink.lines.size(), 1);
+    QCOMPARE(sink.entries.size(), 1);
 }
 
 void TestRegValues::fileNameParts() {
@@ -161,8 +149,8 @@ void TestRegValues::fileNameWrongId() {
     QVERIFY(UpdateRegValue(RegAdd.File_Name, "31323334", 36, 0));
     QCOMPARE(RegVal.File_Text, QString("    ABCD            "));
     QCOMPARE(RegVal.File_Name, 20);
-    QCOMPARE(sink.lines, (QStringList{"UpdateRegValue:Update File name wrong ID:18",
-                                      "UpdateRegValue:Update File name wrong ID:36"}));
+    QCOMPARE(sink.entries, (QStringList{"UpdateRegValue:Update File name wrong ID:18",
+                                        "UpdateRegValue:Update File name wrong ID:36"}));
 }
 
 void TestRegValues::calibrationErrorBytes() {

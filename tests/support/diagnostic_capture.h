@@ -21,8 +21,12 @@ public:
     void debugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
                       const QString& kind) override {
         lines.push_back({level, tag, text, data, kind});
+        entries << tag + QLatin1Char(':') + text;
     }
-    void addMessage(const QString& text) override { messages << text; }
+    void addMessage(const QString& text) override {
+        messages << text;
+        entries << text;
+    }
 
     bool hasText(const QString& text) const {
         for (const CapturedLine& line : lines)
@@ -33,6 +37,7 @@ public:
 
     std::vector<CapturedLine> lines;
     QStringList messages;
+    QStringList entries;  // "tag:text" for diagnostic lines and plain log messages, in order
 
 private:
     kv::DiagnosticSink* previous_;
