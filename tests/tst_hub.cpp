@@ -7,6 +7,7 @@
 #include "files/kv7_file.h"
 #include "model/register_map.h"
 #include "tests/support/pty_peer.h"
+#include "ui/app/demo_module.h"
 #include "ui/common/colour_palette.h"
 #include "ui/common/settings_window.h"
 #include "ui/comset/frm_comset.h"
@@ -151,10 +152,11 @@ private slots:
     void failedConnectKeepsThePreviousPort();
     void themeChangeStoresAndRepaints();
     void settingsWindowClosesOnRunMode();
+    void demoReachesRunMode();
 
 private:
     // Starts a main window and waits until start-up and its automatic connect are over.
-    bool start(bool debug, std::unique_ptr<hub> window = nullptr);
+    bool start(bool debug);
     bool openSettings();
 
     QTemporaryDir settingsDir_;
@@ -175,6 +177,7 @@ void TestHub::init() {
               SettingsApplication)
         .clear();
     SetColourTheme(DefaultColourTheme);
+    ShowStatus(QString());
 }
 
 void TestHub::cleanup() {
@@ -183,9 +186,10 @@ void TestHub::cleanup() {
     ModuleMap = NoModuleMap;
 }
 
-bool TestHub::start(bool debug, std::unique_ptr<hub> window) {
+bool TestHub::start(bool debug) {
     SetDebugFlag(debug);
-    hub_ = window ? std::move(window) : std::make_unique<hub>();
+    hub_.reset();  // one message log at a time
+    hub_ = std::make_unique<hub>();
     hub_->show();
     hub_->Load(QString());
     // The automatic connect meets no port and closes again.
@@ -682,6 +686,34 @@ void TestHub::settingsWindowClosesOnRunMode() {
     QVERIFY(hub_->settingsWindow());
     ShowStatus(QStringLiteral("Run Mode"));
     QTRY_VERIFY_WITH_TIMEOUT(!hub_->settingsWindow(), WaitMs);
+}
+
+void TestHub::demoReachesRunMode() {
+    store(KeyCommPort, QStringLiteral("9"));
+    DemoModule demo;
+    QString error;
+    QVERIFY2(demo.start(QStringLiteral("KV760-20"), error), qPrintable(error));
+    QCOMPARE(demo.modelName(), QStringLiteral("KV760-20"));
+    hub_ = std::make_unique<hub>();
+    hub_->show();
+    hub_->Load(QString());
+    hub_->overrideConnection(DemoPort, DemoConnector, QStringLiteral("Demo"));
+    QSignalSpy identified(&hub_->connection(), &ModuleConnection::runMode);
+    QVERIFY(identified.wait(60000));
+    QCOMPARE(StatusText(), QStringLiteral("Run Mode"));
+    QVERIFY(hub_->engine().connected());
+    QCOMPARE(ModuleMap, 6);
+    QCOMPARE(hub_->findChild<QLabel*>(QStringLiteral("labModule"))->text().trimmed(),
+             QStringLiteral("KV760-20"));
+    // The user's own port stays stored, whatever the demonstration connects to.
+    QString ignored;
+    hub_->OpenCom(false, ignored);
+    QVERIFY(openSettings());
+    auto* ports = hub_->settingsWindow()->findChild<QTreeWidget*>(QStringLiteral("lstPorts"));
+    QVERIFY(ports->currentItem()->text(0).startsWith(QStringLiteral("Com1 KV760")));
+    hub_->settingsWindow()->findChild<QPushButton*>(QStringLiteral("cmdSet0"))->click();
+    QCOMPARE(stored(KeyCommPort), QVariant(QStringLiteral("9")));
+    SetConnectionPropertiesFrozen(false);
 }
 
 QTEST_MAIN(TestHub)

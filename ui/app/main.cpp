@@ -4,11 +4,14 @@
 #include "engine/app_settings.h"
 #include "engine/diagnostics.h"
 #include "engine/start_up.h"
+#include "ui/app/demo_module.h"
 #include "ui/app/open_files.h"
 #include "ui/hub/hub.h"
 
 #include <QApplication>
 #include <QFileInfo>
+
+#include <cstdio>
 
 int main(int argc, char* argv[]) {
     QApplication app(argc, argv);
@@ -32,10 +35,19 @@ int main(int argc, char* argv[]) {
     if (role == kv::OpenFilesRole::Unavailable)
         qCWarning(lcEngine).noquote() << "Files opened later will not reach this window:" << error;
 
+    kv::DemoModule demo;
+    if (command.demo && !demo.start(command.demoModel, error)) {
+        std::fprintf(stderr, "kv700 --demo: %s\n", qPrintable(error));
+        return 2;
+    }
+
     kv::hub mainWindow;
     QObject::connect(&openFiles, &kv::OpenFilesServer::fileReceived, &mainWindow,
                      &kv::hub::ReceiveFile);
     mainWindow.show();
     mainWindow.Load(file);
+    if (command.demo)
+        mainWindow.overrideConnection(kv::DemoPort, kv::DemoConnector,
+                                      QStringLiteral("Demo: simulated ") + demo.modelName());
     return app.exec();
 }

@@ -318,6 +318,14 @@ void hub::ReceiveFile(const QString& path) {
     activateWindow();
 }
 
+void hub::overrideConnection(qint16 port, qint16 connector, const QString& note) {
+    SetConnectionPropertiesFrozen(true);
+    engine().setPort(port);
+    engine().setConnector(connector);
+    connectionNote_ = note;
+    showConnection(engine().connected());
+}
+
 bool hub::OpenCom(bool connect, QString& error) {
     return connection_.OpenCom(connect, error);
 }
@@ -611,13 +619,15 @@ void hub::showConnection(bool connected) {
     const QString adapterName = adapter == 0   ? QStringLiteral("QTR490-02")
                                 : adapter == 1 ? QStringLiteral("KV705-01")
                                                : QStringLiteral("adapter type %1").arg(adapter);
+    QString text;
     if (connected)
-        labConnection_->setText(QStringLiteral("COM%1, %2").arg(engine().port()).arg(adapterName));
+        text = QStringLiteral("COM%1, %2").arg(engine().port()).arg(adapterName);
     else if (engine().port() <= 0)
-        labConnection_->setText(QStringLiteral("No COM port chosen: press Settings"));
+        text = QStringLiteral("No COM port chosen: press Settings");
     else
-        labConnection_->setText(
-            QStringLiteral("Not connected (COM%1, %2)").arg(engine().port()).arg(adapterName));
+        text = QStringLiteral("Not connected (COM%1, %2)").arg(engine().port()).arg(adapterName);
+    labConnection_->setText(
+        connectionNote_.isEmpty() ? text : connectionNote_ + QStringLiteral(" - ") + text);
 }
 
 void hub::ChangeColourTheme(int theme) {

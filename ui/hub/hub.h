@@ -60,6 +60,10 @@ public:
     // A file handed over by another start of the program.
     void ReceiveFile(const QString& path);
 
+    // Connects to `port` instead of the stored one, without storing it; `note`
+    // tells the user why (a demonstration on a simulated module).
+    void overrideConnection(qint16 port, qint16 connector, const QString& note);
+
     ModuleConnection& connection() { return connection_; }
     RequestEngine& engine() { return connection_.engine(); }
     MessageLog& messageLog() { return log_; }
@@ -156,6 +160,7 @@ private:
     frmLog* logWindow_ = nullptr;
     bool changingTabs_ = false;
     QString shownTag_;
+    QString connectionNote_;
 };
 
 }  // namespace kv
