@@ -34,7 +34,7 @@ const char* const buttonTips[] = {
 frmComSet::frmComSet(hub& owner)
     : QWidget(&owner, Qt::Window), owner_(owner), lstPorts_(new QTreeWidget(this)),
       cboAdapter_(new QComboBox(this)), cboTheme_(new QComboBox(this)),
-      labMessage_(new QLabel(this)) {
+      labMessage_(new QLabel(this)), labAdvice_(new QLabel(this)) {
     setObjectName(QStringLiteral("frmComSet"));
     setWindowTitle(QStringLiteral("KV700 Settings"));
 
@@ -62,6 +62,11 @@ frmComSet::frmComSet(hub& owner)
     labMessage_->setMinimumHeight(labMessage_->fontMetrics().height() * 2 + 12);
     labMessage_->setTextInteractionFlags(Qt::TextSelectableByMouse);
 
+    labAdvice_->setObjectName(QStringLiteral("labAdvice"));
+    labAdvice_->setWordWrap(true);
+    labAdvice_->setTextInteractionFlags(Qt::TextSelectableByMouse);
+    labAdvice_->hide();
+
     for (int i = 0; i < 3; ++i) {
         cmdSet_[i] = new QPushButton(QString::fromLatin1(buttonCaptions[i]), this);
         cmdSet_[i]->setObjectName(QStringLiteral("cmdSet%1").arg(i));
@@ -87,6 +92,7 @@ frmComSet::frmComSet(hub& owner)
     layout->addWidget(
         new QLabel(QStringLiteral("COM ports found, with the module that answered:"), this));
     layout->addWidget(lstPorts_, 1);
+    layout->addWidget(labAdvice_);
     layout->addLayout(choices);
     layout->addLayout(buttons);
     layout->addWidget(labMessage_);
@@ -117,6 +123,8 @@ void frmComSet::LoadPropertySettings() {
         owner_.GetConnector() == 0 || owner_.GetConnector() == 1 ? owner_.GetConnector() : -1);
     cboTheme_->setCurrentIndex(ColourTheme());
     lstPorts_->clear();
+    labAdvice_->clear();
+    labAdvice_->hide();
     QPointer<frmComSet> alive(this);
     for (int port = FirstProbedPort; port <= LastProbedPort && alive; ++port) {
         addProbedPort(qint16(port));
@@ -148,6 +156,10 @@ void frmComSet::addProbedPort(qint16 port) {
     auto* item = new QTreeWidgetItem(lstPorts_, {*entry, ProbeDeviceNote(port, error)});
     item->setData(0, Qt::UserRole, int(port));
     item->setToolTip(1, item->text(1));
+    if (ProbeDeniedAccess(error) && labAdvice_->isHidden()) {
+        labAdvice_->setText(PermissionAdvice(port));
+        labAdvice_->show();
+    }
 }
 
 void frmComSet::ApplySettings() {

@@ -45,6 +45,7 @@ private:
     QComboBox* cboTheme_;
     QPushButton* cmdSet_[3];
     QLabel* labMessage_;
+    QLabel* labAdvice_;
     bool probing_ = false;
 };
 

@@ -17,8 +17,12 @@ constexpr int LastProbedPort = 30;
 std::optional<QString> ProbeEntryText(qint16 port, bool replied, const QByteArray& reply,
                                       const QString& error);
 
-// The device behind COM `port`, with advice when the user may not open it.
+// The device behind COM `port` (and where its link points), marked when the
+// user may not open it.
 QString ProbeDeviceNote(qint16 port, const QString& error);
+bool ProbeDeniedAccess(const QString& error);
+// What to do about a port the user may not open.
+QString PermissionAdvice(qint16 port);
 
 // Probes COM `port` with the given adapter type, outside the request engine.
 std::optional<QString> ProbePort(qint16 port, qint16 connector, QString& error);
