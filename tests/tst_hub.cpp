@@ -16,6 +16,7 @@
 #include "ui/hub/please_wait.h"
 
 #include <QAction>
+#include <QCheckBox>
 #include <QComboBox>
 #include <QFile>
 #include <QLabel>
@@ -144,6 +145,9 @@ private slots:
     void fileHandedOverWhileConnected();
     void missingUserGuide();
     void pleaseWaitBox();
+    void addDelayHoldsTheEngine();
+    void debugPanelOptions();
+    void closingDisconnectsAndClosesTheRest();
 
     void probeEntries_data();
     void probeEntries();
@@ -566,6 +570,57 @@ void TestHub::pleaseWaitBox() {
     QVERIFY(!hub_->waitBoxShown());
 }
 
+void TestHub::addDelayHoldsTheEngine() {
+    QVERIFY(start(false));
+    QString error;
+    QVERIFY(hub_->OpenCom(true, error));
+    QVERIFY(hub_->connection().timerActive());
+    bool runningDuringDelay = true;
+    QTimer::singleShot(0, this, [&] { runningDuringDelay = hub_->connection().timerActive(); });
+    hub_->AddDelay(0.05f, QStringLiteral("settling"));
+    QCOMPARE(StatusText(), QStringLiteral("Delay settling"));
+    QVERIFY(!runningDuringDelay);
+    QVERIFY(hub_->connection().timerActive());
+
+    QVERIFY(hub_->OpenCom(false, error));
+    hub_->AddDelay(0.01f, QStringLiteral("again"));
+    QVERIFY(!hub_->connection().timerActive());  // stays as it was
+}
+
+void TestHub::debugPanelOptions() {
+    QVERIFY(start(true));
+    hub_->messageLog().clear();
+    DebugMessage(DiagSend, QStringLiteral("COM"), QStringLiteral("1.00 >"), "R",
+                 QStringLiteral("RV"));
+    QVERIFY(hub_->messageLog().text().isEmpty());  // "Send" not ticked
+    hub_->findChild<QCheckBox*>(QStringLiteral("chkLevel0"))->setChecked(true);
+    DebugMessage(DiagSend, QStringLiteral("COM"), QStringLiteral("1.00 >"), "R",
+                 QStringLiteral("RV"));
+    QCOMPARE(hub_->messageLog().text(), QStringLiteral("COM:RV1.00 > 52\n"));
+
+    hub_->findChild<QCheckBox*>(QStringLiteral("chkNoDef"))->setChecked(true);
+    QVERIFY(hub_->connection().pollingSuspended());
+
+    auto* tester = hub_->findChild<QPushButton*>(QStringLiteral("cmdDebug2"));
+    QCOMPARE(tester->text(), QStringLiteral("KV Tester"));
+    QVERIFY(!tester->isEnabled());
+    int opened = 0;
+    hub_->setServiceTool(ToolTester, [&opened] { ++opened; });
+    QVERIFY(tester->isEnabled());
+    tester->click();
+    QCOMPARE(opened, 1);
+}
+
+void TestHub::closingDisconnectsAndClosesTheRest() {
+    QVERIFY(start(false));
+    QVERIFY(openSettings());
+    QString error;
+    QVERIFY(hub_->OpenCom(true, error));
+    hub_->close();
+    QVERIFY(!hub_->engine().connected());
+    QTRY_VERIFY_WITH_TIMEOUT(!hub_->settingsWindow(), WaitMs);
+}
+
 void TestHub::probeEntries_data() {
     QTest::addColumn<bool>("replied");
     QTest::addColumn<QByteArray>("reply");
@@ -591,8 +646,7 @@ void TestHub::probeEntries() {
     QFETCH(QString, error);
     const std::optional<QString> entry = ProbeEntryText(7, replied, reply, error);
     QTEST(entry.value_or(QString()), "entry");
-    if (error == QLatin1String("/Port file error 13"))
-    {
+    if (error == QLatin1String("/Port file error 13")) {
         QVERIFY(ProbeDeviceNote(7, error).endsWith(QLatin1String("(no permission)")));
         QVERIFY(PermissionAdvice(7).contains(QLatin1String("adduser")));
     }
