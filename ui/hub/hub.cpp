@@ -9,9 +9,7 @@
 #include "model/register_values.h"
 #include "ui/about/frm_about.h"
 #include "ui/common/colour_palette.h"
-#include "ui/common/document_launcher.h"
-#include "ui/common/kv_file_dialog.h"
-#include "ui/common/settings_window.h"
+#include "ui/common/tab_window.h"
 #include "ui/comset/frm_comset.h"
 #include "ui/hub/please_wait.h"
 #include "ui/log/frm_log.h"
@@ -39,9 +37,6 @@
 namespace kv {
 
 namespace {
-const QString hubTag = QStringLiteral("hub");
-constexpr int FirstMap = 1;
-constexpr int LastMap = 7;
 constexpr int TopEdge = 10;
 
 struct ToolButton {
@@ -71,13 +66,10 @@ const LevelOption levelOptions[] = {
 const char* const serviceTools[] = {"Trim Values", "Trim Wild", "KV Tester"};
 // clang-format on
 
-bool knownMap(int map) {
-    return map >= FirstMap && map <= LastMap;
-}
 }  // namespace
 
 hub::hub(QWidget* parent) : QMainWindow(parent) {
-    setObjectName(hubTag);
+    setObjectName(HubTag);
     setWindowTitle(ProgramCaption(QStringLiteral(KV700_VERSION)));
 
     buildToolBar();
@@ -338,208 +330,6 @@ void hub::optConnect_Click(int index) {
     if (!OpenCom(connect, error))
         ShowStatus((connect ? QStringLiteral("Open Com: ") : QStringLiteral("Close Com: ")) +
                    error);
-}
-
-void hub::cmdProcess_Click(int index) {
-    if (!engine().ReserveSomeTime()) {
-        ShowStatus(QStringLiteral("Please try again !!"));
-        return;
-    }
-    switch (index) {
-    case CmdOpenFile:
-        openFileIntoTab();
-        break;
-    case CmdReadModule:
-        readModuleIntoTab();
-        break;
-    case CmdUserGuide:
-        openUserGuide();
-        break;
-    case CmdSettings:
-        openSettings();
-        break;
-    case CmdCloseTab:
-        closeActiveTab();
-        break;
-    }
-}
-
-void hub::openFileIntoTab() {
-    QString name;
-    qint32 typeCode = 0;
-    if (OpenKVFile(name, typeCode, this)) {
-        ShowStatus(name);
-        OpenRestoredModule(GetModMap(typeCode));
-    } else {
-        ShowStatus(QStringLiteral("Failed: ") + name);
-    }
-    // The new window only shows the loaded settings; nothing is left to wait for.
-    engine().setReserved(false);
-}
-
-void hub::readModuleIntoTab() {
-    const SettingsWindowClass* windowClass =
-        knownMap(ModuleMap) ? settingsWindows_.find(ModuleMap) : nullptr;
-    if (!knownMap(ModuleMap)) {
-        FailGeneral(QStringLiteral("cmdProcess"), hubTag, QStringLiteral("Unknown Module Type"));
-    } else if (!windowClass) {
-        ShowStatus(QStringLiteral("cmdProcess: this version has no settings window for the ") +
-                   DisplayModuleType(RegVal.Mod_Type));
-    } else {
-        SettingsWindow* window = windowClass->create(*this);
-        addTabWindow(window);
-        // The window's reading run keeps the engine and releases it when done.
-        window->LoadDialouge(ModuleMap);
-        return;
-    }
-    engine().setReserved(false);
-}
-
-void hub::openUserGuide() {
-    const QString path =
-        QCoreApplication::applicationDirPath() + QLatin1Char('/') + QLatin1String(UserGuideName);
-    QString result = path;
-    if (ShellOpen(result)) {
-        ShowStatus(path);
-    } else {
-        ShowStatus(result + QStringLiteral(" - the user guide belongs in the program's folder."));
-        AddMessage(result);
-    }
-    engine().setReserved(false);
-}
-
-void hub::openSettings() {
-    optConnect_Click(OptCloseCom);
-    if (!comSet_) {
-        comSet_ = new frmComSet(*this);
-        comSet_->setAttribute(Qt::WA_DeleteOnClose);
-    }
-    comSet_->show();
-    comSet_->raise();
-    comSet_->activateWindow();
-}
-
-void hub::closeActiveTab() {
-    const QString tag = selectedTag();
-    if (TabWindow* window = findTabWindow(tag))
-        window->CloseMe(tag);
-    engine().setReserved(false);
-}
-
-void hub::addTabWindow(TabWindow* window, bool select) {
-    tabWindows_->addWidget(window);
-    changingTabs_ = true;
-    const int index = tabs_->addTab(window->tabTitle());
-    tabs_->setTabData(index, window->tag());
-    changingTabs_ = false;
-    if (auto* receiver = dynamic_cast<CallbackReceiver*>(window))
-        engine().registerReceiver(window->tag(), receiver);
-    connect(window, &TabWindow::tabTitleChanged, this,
-            [this](const QString& tag, const QString& title) {
-                const int at = tabIndexOf(tag);
-                if (at >= 0)
-                    tabs_->setTabText(at, title);
-            });
-    window->SetColour();
-    if (select) {
-        setCurrentTab(index);
-        ts_SelectTab();
-    }
-}
-
-void hub::onTabChanged(int index) {
-    if (changingTabs_)
-        return;
-    if (engine().reserved()) {
-        ShowStatus(QStringLiteral("Try again later !!"));
-        setCurrentTab(tabIndexOf(shownTag_));
-        return;
-    }
-    Q_UNUSED(index);
-    ts_SelectTab();
-}
-
-void hub::ts_SelectTab() {
-    if (tabs_->count() == 0)
-        return;
-    TabWindow* window = findTabWindow(selectedTag());
-    if (!window)
-        return;
-    tabWindows_->setCurrentWidget(window);
-    shownTag_ = window->tag();
-    cmdProcess_[CmdCloseTab]->setEnabled(window->CanClose());
-}
-
-void hub::ts_CloseTabSelectNext(const QString& tag) {
-    const int index = tag.isEmpty() ? tabs_->currentIndex() : tabIndexOf(tag);
-    if (index <= 0)
-        return;  // the start page stays
-    const bool wasSelected = index == tabs_->currentIndex();
-    TabWindow* window = findTabWindow(tabs_->tabData(index).toString());
-    changingTabs_ = true;
-    tabs_->removeTab(index);
-    changingTabs_ = false;
-    if (window) {
-        engine().unregisterReceiver(window->tag());
-        tabWindows_->removeWidget(window);
-        window->deleteLater();
-    }
-    if (wasSelected && index >= 2)
-        setCurrentTab(index - 1);
-    ts_SelectTab();
-}
-
-TabWindow* hub::findTabWindow(const QString& tag) const {
-    for (int i = 0; i < tabWindows_->count(); ++i) {
-        auto* window = qobject_cast<TabWindow*>(tabWindows_->widget(i));
-        if (window && window->tag() == tag)
-            return window;
-    }
-    return nullptr;
-}
-
-QString hub::selectedTag() const {
-    return tabs_->tabData(tabs_->currentIndex()).toString();
-}
-
-int hub::tabCount() const {
-    return tabs_->count();
-}
-
-int hub::tabIndexOf(const QString& tag) const {
-    for (int i = 0; i < tabs_->count(); ++i)
-        if (tabs_->tabData(i).toString() == tag)
-            return i;
-    return -1;
-}
-
-void hub::setCurrentTab(int index) {
-    changingTabs_ = true;
-    tabs_->setCurrentIndex(index);
-    changingTabs_ = false;
-}
-
-bool hub::OpenRestoredModule(int map) {
-    if (!knownMap(map)) {
-        ShowStatus(QStringLiteral("OpenRestoredModule: ? Module"));
-        return false;
-    }
-    const SettingsWindowClass* windowClass = settingsWindows_.find(map);
-    if (!windowClass) {
-        ShowStatus(QStringLiteral("OpenRestoredModule: this version has no settings window for "
-                                  "register map %1; the file cannot be shown.")
-                       .arg(map));
-        return false;
-    }
-    SettingsWindow* window = windowClass->create(*this);
-    addTabWindow(window);
-    window->Restore(map);
-    return true;
-}
-
-void hub::CheckMinorTrim(const QString& tag) {
-    if (auto* window = dynamic_cast<SettingsWindow*>(findTabWindow(tag)))
-        window->CheckMinorTrim();
 }
 
 void hub::setLivePanel(QWidget* panel) {

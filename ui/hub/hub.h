@@ -5,6 +5,7 @@
 
 #include "engine/message_log.h"
 #include "engine/module_connection.h"
+#include "model/register_map.h"
 #include "ui/common/themed_window.h"
 #include "ui/comset/frm_comset.h"
 #include "ui/hub/settings_window_classes.h"
@@ -46,6 +47,13 @@ enum ConnectOption { OptCloseCom = 0, OptConnect = 1 };
 enum ServiceTool { ToolTrimValues = 0, ToolTrimWild = 1, ToolTester = 2 };
 
 constexpr auto UserGuideName = "KV705-DS41876-UserGuide-9.pdf";
+
+inline const QString HubTag = QStringLiteral("hub");
+
+// The register maps of the module families, each with its settings window class.
+inline bool IsModuleMap(int map) {
+    return map >= 1 && map <= MapCount;
+}
 
 class hub : public QMainWindow, public ThemedWindow {
     Q_OBJECT
