@@ -139,6 +139,7 @@ private slots:
     void openRestoredModule_data();
     void openRestoredModule();
     void closingTabsSelectsTheOneBefore();
+    void windowGoneByItselfIsNotCalledBack();
     void fileOnCommandLineOpensInsteadOfConnecting();
     void unreadableFileOnCommandLine();
     void fileHandedOverWhileStartingUp();
@@ -461,6 +462,25 @@ void TestHub::closingTabsSelectsTheOneBefore() {
     QCOMPARE(hub_->selectedTag(), tabStrip(*hub_)->tabData(1).toString());  // the log
     QVERIFY(!command(*hub_, CmdCloseTab)->isEnabled());
     QVERIFY(!hub_->engine().reserved());
+}
+
+void TestHub::windowGoneByItselfIsNotCalledBack() {
+    QVERIFY(start(false));
+    FakeSettings* made = nullptr;
+    hub_->settingsWindowClasses().add({3, "frmFake", [&made](hub& h) {
+                                           made = new FakeSettings(h);
+                                           return made;
+                                       }});
+    QVERIFY(hub_->OpenRestoredModule(3));
+    const QString tag = made->tag();
+    hub_->engine().setState(StateRun);
+    QString error;
+    QVERIFY(hub_->engine().R_CB(20, 16, tag, CallbackGet, error));
+    delete made;
+    QCOMPARE(hub_->tabCount(), 1);
+    QCOMPARE(shownTag(*hub_), tabStrip(*hub_)->tabData(0).toString());
+    hub_->engine().ProcessCallBack(20, 16, QString(), true);
+    QCOMPARE(StatusText(), QStringLiteral("Missing CB form?"));
 }
 
 void TestHub::fileOnCommandLineOpensInsteadOfConnecting() {

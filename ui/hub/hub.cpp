@@ -119,10 +119,9 @@ hub::hub(QWidget* parent) : QMainWindow(parent) {
 
 hub::~hub() {
     SetModuleCaptionHandler(nullptr);
-    // Windows still hosted must not be called back once the engine is gone.
-    for (int i = 0; i < tabWindows_->count(); ++i)
-        if (auto* window = qobject_cast<TabWindow*>(tabWindows_->widget(i)))
-            engine().unregisterReceiver(window->tag());
+    // While the engine still exists, so that each window leaves its callbacks behind.
+    while (tabWindows_->count() > 0)
+        delete tabWindows_->widget(0);
 }
 
 void hub::buildToolBar() {

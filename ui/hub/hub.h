@@ -134,7 +134,7 @@ private:
     void closeActiveTab();
 
     void optConnect_Click(int index);
-    void onTabChanged(int index);
+    void onTabChanged();
     void finishStartUp();
     void openFile(const QString& path);
     void showStatus(const QString& text);

@@ -24,6 +24,18 @@ void hub::addTabWindow(TabWindow* window, bool select) {
                 if (at >= 0)
                     tabs_->setTabText(at, title);
             });
+    // A window that goes away by itself takes its tab and its callbacks with it.
+    const QString tag = window->tag();
+    connect(window, &QObject::destroyed, this, [this, tag] {
+        engine().unregisterReceiver(tag);
+        const int at = tabIndexOf(tag);
+        if (at < 0)
+            return;
+        changingTabs_ = true;
+        tabs_->removeTab(at);
+        changingTabs_ = false;
+        ts_SelectTab();
+    });
     window->SetColour();
     if (select) {
         setCurrentTab(index);
@@ -31,7 +43,7 @@ void hub::addTabWindow(TabWindow* window, bool select) {
     }
 }
 
-void hub::onTabChanged(int index) {
+void hub::onTabChanged() {
     if (changingTabs_)
         return;
     if (engine().reserved()) {
@@ -39,7 +51,6 @@ void hub::onTabChanged(int index) {
         setCurrentTab(tabIndexOf(shownTag_));
         return;
     }
-    Q_UNUSED(index);
     ts_SelectTab();
 }
 
