@@ -10,6 +10,13 @@ bool isOption(const QString& argument) {
     return argument.startsWith(QLatin1Char('-'));
 }
 
+// A launcher that quotes the path itself passes the quotes on.
+QString unquoted(const QString& argument) {
+    const bool quoted = argument.size() >= 2 && argument.startsWith(QLatin1Char('"')) &&
+                        argument.endsWith(QLatin1Char('"'));
+    return quoted ? argument.mid(1, argument.size() - 2) : argument;
+}
+
 bool looksLikeModel(const QString& argument) {
     return !isOption(argument) && argument != debugWord && !argument.contains(QLatin1Char('/')) &&
            !argument.contains(QLatin1Char('.'));
@@ -33,7 +40,7 @@ CommandLine ParseCommandLine(const QStringList& arguments) {
             command.demo = true;
             command.demoModel = argument.mid(demoOption.size() + 1);
         } else if (!isOption(argument) && argument != debugWord && command.fileToOpen.isEmpty()) {
-            command.fileToOpen = argument;
+            command.fileToOpen = unquoted(argument);
         }
     }
     return command;

@@ -230,6 +230,8 @@ void TestHub::commandLine_data() {
         << QStringList{"/data/a b.kv7", "Debug"} << true << "/data/a b.kv7" << false << "";
     QTest::newRow("Debug inside a path")
         << QStringList{"/home/Debugger/a.kv7"} << true << "/home/Debugger/a.kv7" << false << "";
+    QTest::newRow("quotes passed on")
+        << QStringList{"\"/data/a b.kv7\""} << false << "/data/a b.kv7" << false << "";
     QTest::newRow("first file wins")
         << QStringList{"a.kv7", "b.kv7"} << false << "a.kv7" << false << "";
     QTest::newRow("options are no files")
