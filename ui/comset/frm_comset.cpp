@@ -13,7 +13,6 @@
 #include <QHBoxLayout>
 #include <QHeaderView>
 #include <QLabel>
-#include <QPointer>
 #include <QPushButton>
 #include <QTimer>
 #include <QTreeWidget>
@@ -125,8 +124,7 @@ void frmComSet::LoadPropertySettings() {
     lstPorts_->clear();
     labAdvice_->clear();
     labAdvice_->hide();
-    QPointer<frmComSet> alive(this);
-    for (int port = FirstProbedPort; port <= LastProbedPort && alive; ++port) {
+    for (int port = FirstProbedPort; port <= LastProbedPort; ++port) {
         addProbedPort(qint16(port));
         AddMessage(
             QStringLiteral("Load Settings: COM%1 of %2 searched").arg(port).arg(LastProbedPort));
@@ -134,8 +132,6 @@ void frmComSet::LoadPropertySettings() {
         QApplication::processEvents(QEventLoop::ExcludeUserInputEvents);
     }
     QApplication::restoreOverrideCursor();
-    if (!alive)
-        return;
     setBusy(false);
     for (int i = 0; i < lstPorts_->topLevelItemCount(); ++i) {
         QTreeWidgetItem* item = lstPorts_->topLevelItem(i);
