@@ -1,0 +1,60 @@
+#include "model/register_values.h"
+#include "ui/live/kv720_input_names.h"
+#include "ui/live/live_common.h"
+#include "ui/live/live_display.h"
+
+namespace kv {
+
+using namespace live;
+
+namespace {
+
+struct KindPrefix {
+    int kind;
+    bool engineering;  // measured range and engineering range shown; value in engineering units
+    const char* prefix;
+};
+
+// Input types 1..8 (TypInput). The temperature sensors show the measuring unit.
+constexpr KindPrefix prefixes[] = {
+    {1, true, "mv : "},       {2, false, "TC : "},      {3, false, "RTDT 3W : "},
+    {4, false, "RTDT 4W : "}, {5, false, "RTDT 2W : "}, {6, true, "RT 2W : "},
+    {7, true, "POT : "},      {8, true, "WT : "},
+};
+
+}  // namespace
+
+void KV720Display(LiveView& view, const LiveSource& source) {
+    const RegMap& val = source.val;
+    FlashInput(view, val.Input_Reading, InputReadingLimit(Kv720Map));
+    if (!InRange(val.In_Rng1, 1, 8)) {
+        FailInputRange(view);
+        return;
+    }
+    const float value = EngineeringInput(val);
+    const Kv720InputNames names = Kv720Names(val.TypInput, val.Type_In_Unit);
+    KindPrefix kind{0, false, "?? : "};
+    for (const KindPrefix& row : prefixes)
+        if (row.kind == val.TypInput)
+            kind = row;
+    const QString measured =
+        Fixed(val.Meas_Unit_Z, "0.00") + QLatin1Char('-') + Fixed(val.Meas_Unit_F, "0.00");
+    QString units;
+    if (kind.engineering) {
+        units = EngUnitText(val);
+        view.input.summary = QLatin1String(kind.prefix) + measured + QLatin1Char(' ') + names.unit +
+                             names.sensor + CrLf + QStringLiteral("Eng : ") +
+                             Fixed(val.Eng_In_Z, "0.00") + QLatin1Char('-') +
+                             Fixed(val.Eng_In_F, "0.00") + QLatin1Char(' ') + units;
+    } else {
+        units = names.unit;
+        view.input.summary = QLatin1String(kind.prefix) + names.sensor + CrLf +
+                             QStringLiteral("Cal : ") + measured + names.unit;
+    }
+    ShowInputValue(view.input, value, units);
+    view.input.response = Bit(val.Flag_A, 1) ? QStringLiteral("Slow") : QStringLiteral("Fast");
+    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, 2), Bit(val.Flag_A, 3),
+                Bit(val.in_ch, 7));
+}
+
+}  // namespace kv
