@@ -745,15 +745,19 @@ void TestHub::themeChangeStoresAndRepaints() {
     auto* themes = hub_->settingsWindow()->findChild<QComboBox*>(QStringLiteral("cboTheme"));
     QCOMPARE(themes->currentIndex(), 1);
 
+    QSignalSpy repainted(hub_.get(), &hub::colourThemeChanged);
     // The theme already in use: nothing stored.
     emit themes->activated(1);
     QVERIFY(!stored(KeyColourTheme).isValid());
+    QCOMPARE(repainted.count(), 0);
 
     themes->setCurrentIndex(0);
     emit themes->activated(0);
     QCOMPARE(stored(KeyColourTheme), QVariant(QStringLiteral("0")));
     QCOMPARE(ColourTheme(), 0);
     QCOMPARE(bar->palette().color(QPalette::Window), QColor(0, 78, 75));
+    QCOMPARE(repainted.count(), 1);
+    QCOMPARE(repainted.at(0).at(0).toInt(), 0);
 }
 
 void TestHub::settingsWindowClosesOnRunMode() {

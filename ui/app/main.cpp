@@ -6,7 +6,9 @@
 #include "engine/start_up.h"
 #include "ui/app/demo_module.h"
 #include "ui/app/open_files.h"
+#include "ui/common/colour_palette.h"
 #include "ui/hub/hub.h"
+#include "ui/live/live_panel.h"
 
 #include <QApplication>
 #include <QFileInfo>
@@ -44,8 +46,14 @@ int main(int argc, char* argv[]) {
     kv::hub mainWindow;
     QObject::connect(&openFiles, &kv::OpenFilesServer::fileReceived, &mainWindow,
                      &kv::hub::ReceiveFile);
+    auto* livePanel = new kv::LivePanel(mainWindow.connection());
+    mainWindow.setLivePanel(livePanel);
+    QObject::connect(&mainWindow, &kv::hub::colourThemeChanged, livePanel, [livePanel](int theme) {
+        livePanel->SetColour(kv::LiveColours::ForTheme(theme));
+    });
     mainWindow.show();
     mainWindow.Load(file);
+    livePanel->SetColour(kv::LiveColours::ForTheme(kv::ColourTheme()));
     if (command.demo)
         mainWindow.overrideConnection(kv::DemoPort, kv::DemoConnector,
                                       QStringLiteral("Demo: simulated ") + demo.modelName());

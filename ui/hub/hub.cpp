@@ -427,6 +427,7 @@ void hub::ChangeColourTheme(int theme) {
     for (QWidget* widget : QApplication::allWidgets())
         if (auto* window = dynamic_cast<ThemedWindow*>(widget))
             window->SetColour();
+    emit colourThemeChanged(ColourTheme());
 }
 
 void hub::SetColour() {

@@ -116,6 +116,10 @@ public:
     void ChangeColourTheme(int theme);
     void SetColour() override;
 
+signals:
+    // After every window has been repainted; widgets that are no window follow it.
+    void colourThemeChanged(int theme);
+
 protected:
     void closeEvent(QCloseEvent* event) override;
 
