@@ -33,6 +33,14 @@ void MessageLog::statusTick() {
     }
 }
 
+void MessageLog::resetStatusCounter() {
+    statusCounter_ = 0;
+    if (!statusVisible_) {
+        statusVisible_ = true;
+        emit statusVisibilityChanged(true);
+    }
+}
+
 void MessageLog::debugMessage(int level, const QString& tag, const QString& text,
                               const QByteArray& data, const QString& kind) {
     if (DebugFlag() && level >= DiagSend && level <= DiagSerialStep && options_[level]) {
@@ -48,12 +56,8 @@ void MessageLog::addMessage(const QString& text) {
 
 void MessageLog::showStatus(const QString& text) {
     status_ = text;
-    statusCounter_ = 0;
-    const bool wasHidden = !statusVisible_;
-    statusVisible_ = true;
     emit statusChanged(text);
-    if (wasHidden)
-        emit statusVisibilityChanged(true);
+    resetStatusCounter();
 }
 
 void MessageLog::append(const QString& text) {

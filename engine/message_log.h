@@ -32,6 +32,8 @@ public:
     bool statusVisible() const { return statusVisible_; }
     // One timer tick: the status line hides after StatusVisibleTicks quiet ticks.
     void statusTick();
+    // The status line visible again for a full StatusVisibleTicks, its text unchanged.
+    void resetStatusCounter();
 
     void debugMessage(int level, const QString& tag, const QString& text, const QByteArray& data,
                       const QString& kind) override;

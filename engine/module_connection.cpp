@@ -95,6 +95,7 @@ bool ModuleConnection::OpenCom(bool connect, QString& error) {
     SetRegMap(RegAdd, NoModuleMap);
     ModuleMap = NoModuleMap;
     engine_.setConnected(connect);
+    emit connectionChanged(connect);
     emit moduleControlsChanged();
     busy_ = false;
     if (connect) {

@@ -33,6 +33,7 @@ public:
     // The main window's timer tick: one engine step, then one polling step.
     void tick();
     void startTimer(int intervalMs);
+    void stopTimer() { timer_.stop(); }
     bool timerActive() const { return timer_.isActive(); }
 
     // "No Def": suspends the live polling.
@@ -44,8 +45,9 @@ public:
     void cbSet(qint32 address, qint16 busId, const QString& text, bool ok) override;
 
 signals:
-    void startUpTick();  // a tick while the program is still starting up
-    void ticked();       // a tick of the running program (status counter)
+    void connectionChanged(bool connected);  // the connection buttons follow it
+    void startUpTick();                      // a tick while the program is still starting up
+    void ticked();                           // a tick of the running program (status counter)
     void moduleTextChanged(const QString& model);
     void moduleControlsChanged();  // ModuleMap changed: the live panel rebuilds
     void runMode();                // identification finished

@@ -468,7 +468,8 @@ bool RequestEngine::ReserveSomeTime() {
         ShowStatus(QStringLiteral("Try Again Later ...!!"));
         return false;
     }
-    if (state_ != StateClosed && state_ != StateRun) {
+    // Nothing is ever sent for a module of unknown type, so there is nothing to wait for.
+    if (state_ != StateClosed && state_ != StateRun && state_ != StateUnknownModule) {
         ShowStatus(QStringLiteral("Please wait ...!!"));
         QElapsedTimer clock;
         clock.start();

@@ -257,6 +257,11 @@ void TestEngine::reserveSomeTime() {
     QVERIFY(!engine_->ReserveSomeTime());
     QCOMPARE(StatusText(), QString("Try Again Later ...!!"));
     QVERIFY(!engine_->reserved());
+
+    // A module of unknown type: the engine sends nothing, so the settings and
+    // service windows must not be kept waiting.
+    engine_->setState(StateUnknownModule);
+    QVERIFY(engine_->ReserveSomeTime());
 }
 
 void TestEngine::messageLogLimits() {
