@@ -254,7 +254,8 @@ QString UsageText() {
         "  --verbose      also write the message log, the engine ticks and the time to stderr\n"
         "  --float        VALUE is a floating value (required for floating registers)\n"
         "\n"
-        "Without --port or --device the port is COM1; without --adapter the adapter type is 0.\n"
+        "Without --port or --device the port is the one the program last connected to (COM1 if\n"
+        "none is stored); without --adapter the adapter type likewise (0 if none is stored).\n"
         "Results go to standard output, progress and failures to standard error.\n"
         "Exit status: 0 success, 1 the operation failed, 2 usage error.\n");
 }

@@ -1,13 +1,17 @@
 #include "cli/cli_port.h"
 
+#include "engine/app_settings.h"
+
 #include <QFile>
 #include <QFileInfo>
 
 namespace kv::cli {
 
 bool PortChoice::resolve(const CliRequest& request, QString& error) {
-    connector_ = request.adapter.value_or(DefaultAdapter);
-    port_ = request.port.value_or(DefaultPort);
+    // Without a choice on the command line the bench uses what the program last connected to.
+    const StoredProperties stored = LoadProperties(DefaultPort, DefaultAdapter);
+    connector_ = request.adapter.value_or(stored.connector);
+    port_ = request.port.value_or(stored.commPort);
     if (request.device.isEmpty())
         return true;
     folder_ = std::make_unique<QTemporaryDir>();
