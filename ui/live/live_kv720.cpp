@@ -1,5 +1,5 @@
+#include "drivers/kv720_codes.h"
 #include "model/register_values.h"
-#include "ui/live/kv720_input_names.h"
 #include "ui/live/live_common.h"
 #include "ui/live/live_display.h"
 
@@ -32,7 +32,8 @@ void KV720Display(LiveView& view, const LiveSource& source) {
         return;
     }
     const float value = EngineeringInput(val);
-    const Kv720InputNames names = Kv720Names(val.TypInput, val.Type_In_Unit);
+    const QString sensor = Kv720ShapeText(val.TypInput, Kv720ShapeCode(val.Type_In_Unit));
+    const QString unit = Kv720UnitText(val.TypInput, Kv720UnitCode(val.Type_In_Unit));
     KindPrefix kind{0, false, "?? : "};
     for (const KindPrefix& row : prefixes)
         if (row.kind == val.TypInput)
@@ -42,14 +43,14 @@ void KV720Display(LiveView& view, const LiveSource& source) {
     QString units;
     if (kind.engineering) {
         units = EngUnitText(val);
-        view.input.summary = QLatin1String(kind.prefix) + measured + QLatin1Char(' ') + names.unit +
-                             names.sensor + CrLf + QStringLiteral("Eng : ") +
+        view.input.summary = QLatin1String(kind.prefix) + measured + QLatin1Char(' ') + unit +
+                             sensor + CrLf + QStringLiteral("Eng : ") +
                              Fixed(val.Eng_In_Z, "0.00") + QLatin1Char('-') +
                              Fixed(val.Eng_In_F, "0.00") + QLatin1Char(' ') + units;
     } else {
-        units = names.unit;
-        view.input.summary = QLatin1String(kind.prefix) + names.sensor + CrLf +
-                             QStringLiteral("Cal : ") + measured + names.unit;
+        units = unit;
+        view.input.summary = QLatin1String(kind.prefix) + sensor + CrLf +
+                             QStringLiteral("Cal : ") + measured + unit;
     }
     ShowInputValue(view.input, value, units);
     view.input.response = Bit(val.Flag_A, 1) ? QStringLiteral("Slow") : QStringLiteral("Fast");
