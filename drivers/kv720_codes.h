@@ -20,7 +20,7 @@ enum Kv720InputType : qint32 {
 // Bits of the control flag word (Flag_A).
 enum Kv720FlagBit {
     Kv720OffsetBit = 0,       // offset direction chosen by the input calibration
-    Kv720ResponseBit = 1,     // fast response
+    Kv720ResponseBit = 1,     // the response choice shown as "Slow"
     Kv720LimitsBit = 2,       // signal limits on
     Kv720ReverseBit = 3,      // reverse action
     Kv720VoltageBit = 4,      // the excitation is a voltage source

@@ -49,13 +49,14 @@ void KV720Display(LiveView& view, const LiveSource& source) {
                              Fixed(val.Eng_In_F, "0.00") + QLatin1Char(' ') + units;
     } else {
         units = unit;
-        view.input.summary = QLatin1String(kind.prefix) + sensor + CrLf +
-                             QStringLiteral("Cal : ") + measured + unit;
+        view.input.summary =
+            QLatin1String(kind.prefix) + sensor + CrLf + QStringLiteral("Cal : ") + measured + unit;
     }
     ShowInputValue(view.input, value, units);
-    view.input.response = Bit(val.Flag_A, 1) ? QStringLiteral("Slow") : QStringLiteral("Fast");
-    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, 2), Bit(val.Flag_A, 3),
-                Bit(val.in_ch, 7));
+    view.input.response =
+        Bit(val.Flag_A, Kv720ResponseBit) ? QStringLiteral("Slow") : QStringLiteral("Fast");
+    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, Kv720LimitsBit),
+                Bit(val.Flag_A, Kv720ReverseBit), Bit(val.in_ch, Kv720RemoteBit));
 }
 
 }  // namespace kv
