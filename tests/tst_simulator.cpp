@@ -111,10 +111,8 @@ class TestSimulator : public QObject {
 private slots:
     void initTestCase();
 
-    void identifiesEveryFamily_data();
-    void identifiesEveryFamily();
-    void writesAndReadsBack_data();
-    void writesAndReadsBack();
+    void everyFamilyIdentifiesAndStores_data();
+    void everyFamilyIdentifiesAndStores();
     void sixteenBitRegistersSignExtend_data();
     void sixteenBitRegistersSignExtend();
     void readOnlyRegistersKeepTheirValue();
@@ -126,15 +124,14 @@ private slots:
     void minorTrimVerdicts();
     void pulseModuleMeasures();
 
-    void droppedReplyTimesOut();
-    void dropEveryNthFrame();
+    void silenceSchedules_data();
+    void silenceSchedules();
     void droppedWriteStillTakesEffect();
     void corruptedCheckIsNeverAccepted();
     void noiseBeforeReply();
     void splitReplyStillArrives();
     void latency_data();
     void latency();
-    void deadModuleStopsAnswering();
     void swapIsSeenInNextModuleTypeRead();
     void swapAtRunTime();
     void portHeldBusy();
@@ -155,13 +152,13 @@ void TestSimulator::initTestCase() {
     qputenv("KV700_PORT_DIR", portDir_.path().toLocal8Bit());
 }
 
-void TestSimulator::identifiesEveryFamily_data() {
+void TestSimulator::everyFamilyIdentifiesAndStores_data() {
     QTest::addColumn<QString>("model");
     for (const QString& model : allModels())
         QTest::newRow(qPrintable(model)) << model;
 }
 
-void TestSimulator::identifiesEveryFamily() {
+void TestSimulator::everyFamilyIdentifiesAndStores() {
     QFETCH(QString, model);
     SimOptions options = optionsFor(model);
     options.module.serial = 4711;
@@ -175,16 +172,6 @@ void TestSimulator::identifiesEveryFamily() {
     if (map.TypInput >= 0)
         QCOMPARE(bench.read(map.TypInput), options.module.subType);
     QCOMPARE(ModelText(options.module.typeCode, qint16(options.module.subType)), model);
-}
-
-void TestSimulator::writesAndReadsBack_data() {
-    identifiesEveryFamily_data();
-}
-
-void TestSimulator::writesAndReadsBack() {
-    QFETCH(QString, model);
-    Bench bench(optionsFor(model));
-    const RegMap map = mapOf(bench.sim.module());
 
     const Exchange write = bench.transact(writeOf(map.Usr_Out1_F, 23456));
     QVERIFY(write.ok);
@@ -383,34 +370,38 @@ void TestSimulator::pulseModuleMeasures() {
     QVERIFY(qAbs(single(map.Trig_Level_RT) - bench.read(map.Trig_Level) / 9930.0) < 1e-3);
 }
 
-void TestSimulator::droppedReplyTimesOut() {
-    SimOptions options = optionsFor("KV714-22");
-    options.faults.dropFrame = 2;
-    Bench bench(options);
-    const int address = mapOf(bench.sim.module()).Serial_No;
-
-    QVERIFY(bench.transact(readOf(address)).ok);
-    const Exchange lost = bench.transact(readOf(address));
-    QVERIFY(!lost.ok);
-    QVERIFY(!lost.portFault);
-    QCOMPARE(lost.error, untouched);  // a plain time-out carries no text
-    QVERIFY(bench.transact(readOf(address)).ok);
-
-    const std::vector<SimLogEntry> log = bench.sim.log();
-    QCOMPARE(int(log.size()), 3);
-    QCOMPARE(log[1].outcome, SimLogEntry::Dropped);
-    QCOMPARE(log[2].outcome, SimLogEntry::Answered);
+void TestSimulator::silenceSchedules_data() {
+    QTest::addColumn<int>("dropFrame");
+    QTest::addColumn<int>("dropEvery");
+    QTest::addColumn<int>("deadAfter");
+    QTest::addColumn<QList<int>>("outcomes");
+    const int A = SimLogEntry::Answered;
+    const int D = SimLogEntry::Dropped;
+    QTest::newRow("frame 2 dropped") << 2 << 0 << -1 << QList<int>{A, D, A};
+    QTest::newRow("every third dropped") << 0 << 3 << -1 << QList<int>{A, A, D, A, A, D};
+    QTest::newRow("dead after two") << 0 << 0 << 2 << QList<int>{A, A, SimLogEntry::Dead};
 }
 
-void TestSimulator::dropEveryNthFrame() {
+void TestSimulator::silenceSchedules() {
+    QFETCH(int, dropFrame);
+    QFETCH(int, dropEvery);
+    QFETCH(int, deadAfter);
+    QFETCH(QList<int>, outcomes);
     SimOptions options = optionsFor("KV716-22");
-    options.faults.dropEvery = 3;
+    options.faults.dropFrame = dropFrame;
+    options.faults.dropEvery = dropEvery;
+    options.faults.deadAfter = deadAfter;
     Bench bench(options);
     const int address = mapOf(bench.sim.module()).Serial_No;
-    QList<bool> answered;
-    for (int frame = 1; frame <= 6; ++frame)
-        answered << bench.transact(readOf(address)).ok;
-    QCOMPARE(answered, (QList<bool>{true, true, false, true, true, false}));
+    for (const int outcome : outcomes) {
+        const Exchange exchange = bench.transact(readOf(address));
+        QCOMPARE(exchange.ok, outcome == SimLogEntry::Answered);
+        QVERIFY(!exchange.portFault);
+        if (!exchange.ok)
+            QCOMPARE(exchange.error, untouched);  // a plain time-out carries no text
+        QCOMPARE(int(bench.sim.log().back().outcome), outcome);
+    }
+    QCOMPARE(bench.sim.log().size(), size_t(outcomes.size()));
 }
 
 void TestSimulator::droppedWriteStillTakesEffect() {
@@ -479,17 +470,6 @@ void TestSimulator::latency() {
     options.faults.latencyMs = latencyMs;
     Bench bench(options);
     QCOMPARE(bench.transact(readOf(RegMap().Mod_Type)).ok, answered);
-}
-
-void TestSimulator::deadModuleStopsAnswering() {
-    SimOptions options = optionsFor("KV716-10");
-    options.faults.deadAfter = 2;
-    Bench bench(options);
-    const int address = RegMap().Mod_Type;
-    QVERIFY(bench.transact(readOf(address)).ok);
-    QVERIFY(bench.transact(readOf(address)).ok);
-    QVERIFY(!bench.transact(readOf(address)).ok);
-    QCOMPARE(bench.sim.log().back().outcome, SimLogEntry::Dead);
 }
 
 void TestSimulator::swapIsSeenInNextModuleTypeRead() {
