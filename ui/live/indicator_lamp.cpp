@@ -19,6 +19,9 @@ IndicatorLamp::IndicatorLamp(const QString& offText, QWidget* parent)
 }
 
 void IndicatorLamp::setLit(const QColor& colour, const QString& text) {
+    // The panel re-applies every lamp on each stored register; repaint only real changes.
+    if (lit_ && colour_ == colour && litText_ == text)
+        return;
     lit_ = true;
     colour_ = colour;
     litText_ = text;
@@ -27,6 +30,8 @@ void IndicatorLamp::setLit(const QColor& colour, const QString& text) {
 }
 
 void IndicatorLamp::setOff() {
+    if (!lit_)
+        return;
     lit_ = false;
     setAccessibleDescription(QString());
     update();
