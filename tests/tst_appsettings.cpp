@@ -1,26 +1,13 @@
 // The stored properties: defaults on a first start and what odd stored texts become.
 #include "engine/app_settings.h"
+#include "tests/support/stored_properties.h"
 
 #include <QSettings>
 #include <QTemporaryDir>
 #include <QtTest>
 
 using namespace kv;
-
-namespace {
-
-void write(const QString& key, const QVariant& value) {
-    QSettings settings(QSettings::NativeFormat, QSettings::UserScope, SettingsApplication,
-                       SettingsApplication);
-    settings.setValue(SettingsSection + QLatin1Char('/') + key, value);
-}
-
-QVariant stored(const QString& key) {
-    QSettings settings(QSettings::NativeFormat, QSettings::UserScope, SettingsApplication,
-                       SettingsApplication);
-    return settings.value(SettingsSection + QLatin1Char('/') + key);
-}
-}  // namespace
+using namespace kv::test;
 
 class TestAppSettings : public QObject {
     Q_OBJECT
@@ -43,9 +30,7 @@ void TestAppSettings::initTestCase() {
 }
 
 void TestAppSettings::init() {
-    QSettings(QSettings::NativeFormat, QSettings::UserScope, SettingsApplication,
-              SettingsApplication)
-        .clear();
+    ClearStoredProperties();
     SetConnectionPropertiesFrozen(false);
 }
 
@@ -85,7 +70,7 @@ void TestAppSettings::storedTexts_data() {
 void TestAppSettings::storedTexts() {
     QFETCH(QString, key);
     QFETCH(QString, text);
-    write(key, text);
+    StoreProperty(key, text);
     const StoredProperties properties = LoadProperties(9, 0);
     QTEST(int(properties.commPort), "commPort");
     QTEST(int(properties.connector), "connector");
@@ -95,8 +80,8 @@ void TestAppSettings::storedTexts() {
 void TestAppSettings::savedAsDecimalTextInPropertiesSection() {
     SaveProperty(KeyCommPort, 5);
     SaveProperty(KeyComBuffer, -1);
-    QCOMPARE(stored(KeyCommPort), QVariant(QStringLiteral("5")));
-    QCOMPARE(stored(KeyComBuffer), QVariant(QStringLiteral("-1")));
+    QCOMPARE(StoredProperty(KeyCommPort), QVariant(QStringLiteral("5")));
+    QCOMPARE(StoredProperty(KeyComBuffer), QVariant(QStringLiteral("-1")));
     QCOMPARE(LoadProperties(0, 0).commPort, qint16(5));
 }
 
@@ -107,10 +92,10 @@ void TestAppSettings::frozenConnectionKeepsTheUsersPort() {
     SaveProperty(KeyConnector, 1);
     SaveProperty(KeyComBuffer, 1);
     SaveProperty(KeyColourTheme, 0);
-    QCOMPARE(stored(KeyCommPort), QVariant(QStringLiteral("4")));
-    QVERIFY(!stored(KeyConnector).isValid());
-    QVERIFY(!stored(KeyComBuffer).isValid());
-    QCOMPARE(stored(KeyColourTheme),
+    QCOMPARE(StoredProperty(KeyCommPort), QVariant(QStringLiteral("4")));
+    QVERIFY(!StoredProperty(KeyConnector).isValid());
+    QVERIFY(!StoredProperty(KeyComBuffer).isValid());
+    QCOMPARE(StoredProperty(KeyColourTheme),
              QVariant(QStringLiteral("0")));  // the theme is the user's choice
 }
 

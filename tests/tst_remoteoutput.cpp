@@ -1,42 +1,14 @@
 // Remote forcing of an output: the typed value checked against the output's
 // range and converted to what the module's remote register takes.
-#include "model/module_ranges.h"
-#include "model/register_map.h"
+#include "tests/support/live_modules.h"
 #include "ui/live/remote_output.h"
 
 #include <QtTest>
 
 using namespace kv;
+using namespace kv::test;
 
 namespace {
-
-void identify(int map) {
-    SetRegMap(RegAdd, NoModuleMap);
-    SetRegMap(RegAdd, map);
-    ModuleMap = map;
-    BuildRangeTables(RegAdd, map);
-}
-
-// A KV720 whose output is calibrated 4.00..20.00 mA on its 0..20 mA row.
-void kv720() {
-    identify(Kv720Map);
-    RegVal.Out_Rng1 = 3;
-    RegVal.COUT_Z = 1000;
-    RegVal.COUT_F = 21000;
-    RegVal.Usr_Out1_Z = 5000;
-    RegVal.Usr_Out1_F = 21000;
-}
-
-// A first-version KV716: output 1 on 4..20 mA, output 2 on 0..10 V.
-void kv716v1() {
-    identify(Kv716v1Map);
-    ProgramRangeTable(Output1)[3].countMin = 820;
-    ProgramRangeTable(Output1)[3].countMax = 4100;
-    ProgramRangeTable(Output2)[8].countMin = 100;
-    ProgramRangeTable(Output2)[8].countMax = 4000;
-    RegVal.Out_Rng1 = 3;
-    RegVal.Out_Rng2 = 8;
-}
 
 RemoteRequest request(int channel, const QString& text) {
     return RemoteOutputRequest(LiveSource::Program(), channel, text);
@@ -47,54 +19,76 @@ RemoteRequest request(int channel, const QString& text) {
 class TestRemoteOutput : public QObject {
     Q_OBJECT
 private slots:
-    void kv720Span_data();
-    void kv720Span();
+    void typedValue_data();
+    void typedValue();
     void kv760HasNoOutputCalibrationOfItsOwn();
-    void firstVersionCounts_data();
-    void firstVersionCounts();
-    void notNumeric_data();
-    void notNumeric();
-    void familiesWithoutRemote_data();
-    void familiesWithoutRemote();
     void unusableOutputRange();
 };
 
-void TestRemoteOutput::kv720Span_data() {
+void TestRemoteOutput::typedValue_data() {
+    QTest::addColumn<int>("map");
+    QTest::addColumn<int>("channel");
     QTest::addColumn<QString>("text");
     QTest::addColumn<bool>("accepted");
     QTest::addColumn<int>("count");
     QTest::addColumn<QString>("refusal");
-    QTest::newRow("12") << "12" << true << 5000 << "";
-    QTest::newRow("4") << "4" << true << 0 << "";
-    QTest::newRow("20") << "20" << true << 10000 << "";
-    QTest::newRow("blanks around") << " 8 " << true << 2500 << "";
-    QTest::newRow("a half rounds down to even") << "4.5" << true << 312 << "";  // 312.5
-    QTest::newRow("a half rounds up to even") << "5.5" << true << 938 << "";    // 937.5
-    QTest::newRow("3.99") << "3.99" << false << 0 << "Remote <4";
-    QTest::newRow("20.01") << "20.01" << false << 0 << "Remote  >20";
+    const int kv720 = Kv720Map;
+    const int kv716 = Kv716v1Map;
+    // The KV720 takes 0.01 % of its 4..20 mA span.
+    QTest::newRow("KV720 4") << kv720 << 0 << "4" << true << 0 << "";
+    QTest::newRow("KV720 20") << kv720 << 0 << "20" << true << 10000 << "";
+    QTest::newRow("KV720 blanks around") << kv720 << 0 << " 8 " << true << 2500 << "";
+    QTest::newRow("KV720 a half rounds down to even")
+        << kv720 << 0 << "4.5" << true << 312 << "";  // 312.5
+    QTest::newRow("KV720 a half rounds up to even")
+        << kv720 << 0 << "5.5" << true << 938 << "";  // 937.5
+    QTest::newRow("KV720 3.99") << kv720 << 0 << "3.99" << false << 0 << "Remote <4";
+    QTest::newRow("KV720 20.01") << kv720 << 0 << "20.01" << false << 0 << "Remote  >20";
+    // The first-version KV716 takes output counts of the range row.
+    QTest::newRow("CH0 at range low") << kv716 << 0 << "4" << true << 820 << "";
+    QTest::newRow("CH0 at range high") << kv716 << 0 << "20" << true << 4100 << "";
+    QTest::newRow("CH0 below") << kv716 << 0 << "3.9" << false << 0 << "Remote CH0 <4";
+    QTest::newRow("CH0 above") << kv716 << 0 << "20.5" << false << 0 << "Remote CH0 >20";
+    QTest::newRow("CH1 2.5 V") << kv716 << 1 << "2.5" << true << 1075 << "";
+    QTest::newRow("CH1 below") << kv716 << 1 << "-0.1" << false << 0 << "Remote CH1 <0";
+    QTest::newRow("empty") << kv716 << 0 << "" << false << 0 << "Remote CH0 not Numeric !!";
+    QTest::newRow("comma") << kv716 << 1 << "12,5" << false << 0 << "Remote CH1 not Numeric !!";
+    QTest::newRow("beyond a single")
+        << kv716 << 0 << "1e39" << false << 0 << "Remote CH0 not Numeric !!";
+    // Families without remote outputs.
+    for (int map : {int(Kv714v2Map), int(Kv716v2Map), int(Kv718AMap), int(NoModuleMap)})
+        QTest::addRow("map %d", map) << map << 0 << "12" << false << 0 << "Remote ? type";
 }
 
-void TestRemoteOutput::kv720Span() {
+void TestRemoteOutput::typedValue() {
+    QFETCH(int, map);
+    QFETCH(int, channel);
     QFETCH(QString, text);
     QFETCH(bool, accepted);
     QFETCH(int, count);
     QFETCH(QString, refusal);
-    kv720();
-    const RemoteRequest result = request(0, text);
+    if (map == Kv720Map) {
+        Kv720WithOutput();
+    } else if (map == Kv716v1Map) {
+        Kv716v1WithOutputs();
+    } else {
+        IdentifyLiveModule(map);
+        RegVal.Out_Rng1 = 3;  // a usable range: only the family refuses
+    }
+    const RemoteRequest result = request(channel, text);
     QCOMPARE(result.accepted, accepted);
     QCOMPARE(result.refusal, refusal);
     QVERIFY(!result.outputUnusable);
     if (accepted) {
         QCOMPARE(result.count, count);
-        QCOMPARE(result.address, RegAdd.Remote1);
+        QCOMPARE(result.address, channel == 0 ? RegAdd.Remote1 : RegAdd.Remote2);
     }
 }
 
 void TestRemoteOutput::kv760HasNoOutputCalibrationOfItsOwn() {
-    identify(Kv760Map);
-    ProgramRangeTable(Output1)[4].countMin = 300;  // 0..1 V
-    ProgramRangeTable(Output1)[4].countMax = 3300;
-    RegVal.COUT_Z = 1;  // not a register of this family: must not be used
+    IdentifyLiveModule(Kv760Map);
+    CalibrateRow(Output1, 4, 300, 3300);  // 0..1 V
+    RegVal.COUT_Z = 1;                    // not a register of this family: must not be used
     RegVal.COUT_F = 2;
     RegVal.Out_Rng1 = 4;
     RegVal.Usr_Out1_Z = 600;   // 0.1 V
@@ -105,82 +99,8 @@ void TestRemoteOutput::kv760HasNoOutputCalibrationOfItsOwn() {
     QCOMPARE(result.address, RegAdd.Remote1);
 }
 
-void TestRemoteOutput::firstVersionCounts_data() {
-    QTest::addColumn<int>("channel");
-    QTest::addColumn<QString>("text");
-    QTest::addColumn<bool>("accepted");
-    QTest::addColumn<int>("count");
-    QTest::addColumn<QString>("refusal");
-    QTest::newRow("CH0 12 mA") << 0 << "12" << true << 2460 << "";
-    QTest::newRow("CH0 at range low") << 0 << "4" << true << 820 << "";
-    QTest::newRow("CH0 at range high") << 0 << "20" << true << 4100 << "";
-    QTest::newRow("CH0 below") << 0 << "3.9" << false << 0 << "Remote CH0 <4";
-    QTest::newRow("CH0 above") << 0 << "20.5" << false << 0 << "Remote CH0 >20";
-    QTest::newRow("CH1 2.5 V") << 1 << "2.5" << true << 1075 << "";
-    QTest::newRow("CH1 below") << 1 << "-0.1" << false << 0 << "Remote CH1 <0";
-    QTest::newRow("CH1 above") << 1 << "10.01" << false << 0 << "Remote CH1 >10";
-}
-
-void TestRemoteOutput::firstVersionCounts() {
-    QFETCH(int, channel);
-    QFETCH(QString, text);
-    QFETCH(bool, accepted);
-    QFETCH(int, count);
-    QFETCH(QString, refusal);
-    kv716v1();
-    const RemoteRequest result = request(channel, text);
-    QCOMPARE(result.accepted, accepted);
-    QCOMPARE(result.refusal, refusal);
-    if (accepted) {
-        QCOMPARE(result.count, count);
-        QCOMPARE(result.address, channel == 0 ? RegAdd.Remote1 : RegAdd.Remote2);
-    }
-}
-
-void TestRemoteOutput::notNumeric_data() {
-    QTest::addColumn<int>("channel");
-    QTest::addColumn<QString>("text");
-    QTest::addColumn<QString>("refusal");
-    QTest::newRow("empty") << 0 << ""
-                           << "Remote CH0 not Numeric !!";
-    QTest::newRow("abc") << 0 << "abc"
-                         << "Remote CH0 not Numeric !!";
-    QTest::newRow("comma") << 1 << "12,5"
-                           << "Remote CH1 not Numeric !!";
-    QTest::newRow("beyond a single") << 0 << "1e39"
-                                     << "Remote CH0 not Numeric !!";
-}
-
-void TestRemoteOutput::notNumeric() {
-    QFETCH(int, channel);
-    QFETCH(QString, text);
-    QFETCH(QString, refusal);
-    kv716v1();
-    const RemoteRequest result = request(channel, text);
-    QVERIFY(!result.accepted);
-    QCOMPARE(result.refusal, refusal);
-}
-
-void TestRemoteOutput::familiesWithoutRemote_data() {
-    QTest::addColumn<int>("map");
-    QTest::newRow("KV714 v2") << int(Kv714v2Map);
-    QTest::newRow("KV716 v2") << int(Kv716v2Map);
-    QTest::newRow("KV718") << int(Kv718AMap);
-    QTest::newRow("no module") << int(NoModuleMap);
-}
-
-void TestRemoteOutput::familiesWithoutRemote() {
-    QFETCH(int, map);
-    kv720();
-    identify(map);
-    RegVal.Out_Rng1 = 3;
-    const RemoteRequest result = request(0, "12");
-    QVERIFY(!result.accepted);
-    QCOMPARE(result.refusal, QStringLiteral("Remote ? type"));
-}
-
 void TestRemoteOutput::unusableOutputRange() {
-    kv720();
+    Kv720WithOutput();
     RegVal.Out_Rng1 = 15;
     RemoteRequest result = request(0, "12");
     QVERIFY(!result.accepted);
@@ -194,7 +114,7 @@ void TestRemoteOutput::unusableOutputRange() {
     QCOMPARE(view.outputs[0].value, QStringLiteral("?? "));
     QCOMPARE(view.outputs[0].summary, QStringLiteral(" = ?? F"));
 
-    kv720();
+    Kv720WithOutput();
     RegVal.Usr_Out1_Z = 0;
     result = request(0, "12");
     QCOMPARE(result.refusal, QStringLiteral("Remote Out 1 Invalid User Cal"));
@@ -202,7 +122,7 @@ void TestRemoteOutput::unusableOutputRange() {
     QCOMPARE(result.outputSummary, QStringLiteral("3"));
 
     // A first-version output range that is no row of its table.
-    kv716v1();
+    Kv716v1WithOutputs();
     RegVal.Out_Rng2 = 20;
     result = request(1, "5");
     QVERIFY(!result.accepted);
