@@ -107,17 +107,8 @@ SettingsSet kv716v2Record() {
 std::vector<Frame> kv714v1Programming() {
     Expect e(1);
     e.read("Mod_Type")
-        .write("In_Rng1")
-        .write("Usr_In1_F")
-        .write("Usr_In1_Z")
-        .write("Resp1")
-        .write("Sig_Lmt_On")
-        .write("Out_Rng1")
-        .write("Usr_Out1_F")
-        .write("Usr_Out1_Z")
-        .write("Sig_Lmt1_F")
-        .write("Sig_Lmt1_Z")
-        .write("Buss_ID")
+        .writes({"In_Rng1", "Usr_In1_F", "Usr_In1_Z", "Resp1", "Sig_Lmt_On", "Out_Rng1",
+                 "Usr_Out1_F", "Usr_Out1_Z", "Sig_Lmt1_F", "Sig_Lmt1_Z", "Buss_ID"})
         .moduleConfirmed();
     return e.frames();
 }
@@ -125,23 +116,9 @@ std::vector<Frame> kv714v1Programming() {
 std::vector<Frame> kv716v1Programming() {
     Expect e(2);
     e.read("Mod_Type")
-        .write("In_Rng1")
-        .write("Usr_In1_F")
-        .write("Usr_In1_Z")
-        .write("Resp1")
-        .write("Sig_Lmt_On")
-        .write("Out_Rng2")
-        .write("Usr_Out2_F")
-        .write("Usr_Out2_Z")
-        .write("Sig_Lmt2_F")
-        .write("Sig_Lmt2_Z")
-        .write("Out_Rng1")
-        .write("Usr_Out1_F")
-        .write("Usr_Out1_Z")
-        .write("Sig_Lmt1_F")
-        .write("Sig_Lmt1_Z")
-        .write("IO_Dir")
-        .write("Buss_ID")
+        .writes({"In_Rng1", "Usr_In1_F", "Usr_In1_Z", "Resp1", "Sig_Lmt_On", "Out_Rng2",
+                 "Usr_Out2_F", "Usr_Out2_Z", "Sig_Lmt2_F", "Sig_Lmt2_Z", "Out_Rng1", "Usr_Out1_F",
+                 "Usr_Out1_Z", "Sig_Lmt1_F", "Sig_Lmt1_Z", "IO_Dir", "Buss_ID"})
         .moduleConfirmed();
     return e.frames();
 }
@@ -149,11 +126,7 @@ std::vector<Frame> kv716v1Programming() {
 std::vector<Frame> kv714v1Reading() {
     Expect e(1);
     e.read("Mod_Type")
-        .read("Buss_ID")
-        .read("Sig_Lmt_On")
-        .read("In_Rng1")
-        .read("Out_Rng1")
-        .read("Int_Temp")
+        .reads({"Buss_ID", "Sig_Lmt_On", "In_Rng1", "Out_Rng1", "Int_Temp"})
         .moduleConfirmed();
     return e.frames();
 }
@@ -161,13 +134,7 @@ std::vector<Frame> kv714v1Reading() {
 std::vector<Frame> kv716v1Reading() {
     Expect e(2);
     e.read("Mod_Type")
-        .read("Buss_ID")
-        .read("Sig_Lmt_On")
-        .read("IO_Dir")
-        .read("In_Rng1")
-        .read("Out_Rng2")
-        .read("Out_Rng1")
-        .read("Int_Temp")
+        .reads({"Buss_ID", "Sig_Lmt_On", "IO_Dir", "In_Rng1", "Out_Rng2", "Out_Rng1", "Int_Temp"})
         .moduleConfirmed();
     return e.frames();
 }
@@ -176,28 +143,11 @@ std::vector<Frame> v2Programming(int map, bool kv716) {
     Expect e(map);
     e.read("Mod_Type")
         .fileName()
-        .write("Eng_Unit1")
-        .write("Eng_Unit2")
-        .write("Eng_Unit3")
-        .write("Eng_Unit4")
-        .write("Eng_In_Z")
-        .write("Eng_In_F")
-        .write("Meas_Unit_Z")
-        .write("Meas_Unit_F")
-        .write("In_Rng1")
-        .write("Usr_In1_Z")
-        .write("Usr_In1_F")
-        .write("Out_Rng1")
-        .write("Usr_Out1_Z")
-        .write("Usr_Out1_F")
-        .write("Sig_Lmt1_Z")
-        .write("Sig_Lmt1_F");
+        .writes({"Eng_Unit1", "Eng_Unit2", "Eng_Unit3", "Eng_Unit4", "Eng_In_Z", "Eng_In_F",
+                 "Meas_Unit_Z", "Meas_Unit_F", "In_Rng1", "Usr_In1_Z", "Usr_In1_F", "Out_Rng1",
+                 "Usr_Out1_Z", "Usr_Out1_F", "Sig_Lmt1_Z", "Sig_Lmt1_F"});
     if (kv716)
-        e.write("Out_Rng2")
-            .write("Usr_Out2_Z")
-            .write("Usr_Out2_F")
-            .write("Sig_Lmt2_Z")
-            .write("Sig_Lmt2_F");
+        e.write("Out_Rng2").writes({"Usr_Out2_Z", "Usr_Out2_F", "Sig_Lmt2_Z", "Sig_Lmt2_F"});
     e.write("Flag_A").table1().read("Input_B4_Table").write("Buss_ID").moduleConfirmed();
     return e.frames();
 }
@@ -214,29 +164,11 @@ std::vector<Frame> v2Reading(int map, bool kv716) {
     e.read("Mod_Type")
         .read("Buss_ID")
         .fileName(true)
-        .read("TypInput")
-        .read("Meas_Unit_Z")
-        .read("Meas_Unit_F")
-        .read("Eng_In_F")
-        .read("Eng_In_Z")
-        .read("Flag_A")
-        .read("Out_Rng1")
-        .read("Usr_Out1_Z")
-        .read("Usr_Out1_F")
-        .read("Sig_Lmt1_Z")
-        .read("Sig_Lmt1_F")
-        .read("Eng_Unit1")
-        .read("Eng_Unit2")
-        .read("Eng_Unit3")
-        .read("Eng_Unit4")
-        .read("Usr_In1_Z")
-        .read("Usr_In1_F");
+        .reads({"TypInput", "Meas_Unit_Z", "Meas_Unit_F", "Eng_In_F", "Eng_In_Z", "Flag_A",
+                "Out_Rng1", "Usr_Out1_Z", "Usr_Out1_F", "Sig_Lmt1_Z", "Sig_Lmt1_F", "Eng_Unit1",
+                "Eng_Unit2", "Eng_Unit3", "Eng_Unit4", "Usr_In1_Z", "Usr_In1_F"});
     if (kv716)
-        e.read("Out_Rng2")
-            .read("Usr_Out2_Z")
-            .read("Usr_Out2_F")
-            .read("Sig_Lmt2_Z")
-            .read("Sig_Lmt2_F");
+        e.read("Out_Rng2").reads({"Usr_Out2_Z", "Usr_Out2_F", "Sig_Lmt2_Z", "Sig_Lmt2_F"});
     e.read("In_Rng1").table1(true).read("Input_B4_Table").read("Int_Temp").moduleConfirmed();
     return e.frames();
 }

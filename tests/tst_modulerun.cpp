@@ -26,41 +26,19 @@ std::vector<Frame> programmingOrder(bool thermocouple) {
     e.read("Mod_Type")
         .write("TypInput")
         .fileName()
-        .write("Eng_Unit1")
-        .write("Eng_Unit2")
-        .write("Eng_Unit3")
-        .write("Eng_Unit4")
-        .write("Eng_In_Z")
-        .write("Eng_In_F")
-        .write("Meas_Unit_Z")
-        .write("Meas_Unit_F")
-        .write("Buss_ID")
-        .write("In_Rng1")
-        .write("in_ch")
-        .write("in_res")
-        .write("Type_In_Unit")
-        .read("CIN_Z")
-        .read("CIN_F")
-        .read("SLOP_P")
-        .read("SLOP_N")
-        .write("Usr_In1_Z")
-        .write("Usr_In1_F")
-        .write("Aux_C")
-        .write("Flag_A")
-        .write("Orig_OS_PWM")
-        .write("Orig_FlagA")
-        .write("Gain_Factor");
+        .writes({"Eng_Unit1", "Eng_Unit2", "Eng_Unit3", "Eng_Unit4", "Eng_In_Z", "Eng_In_F",
+                 "Meas_Unit_Z", "Meas_Unit_F", "Buss_ID", "In_Rng1", "in_ch", "in_res",
+                 "Type_In_Unit"})
+        .reads({"CIN_Z", "CIN_F", "SLOP_P", "SLOP_N"})
+        .writes({"Usr_In1_Z", "Usr_In1_F", "Aux_C", "Flag_A", "Orig_OS_PWM", "Orig_FlagA",
+                 "Gain_Factor"});
     if (thermocouple)
         e.tableC().read("Term_Temp");
     e.table1()
         .read("Input_B4_Table")
         .write("Out_Rng1")
-        .read("COUT_Z")
-        .read("COUT_F")
-        .write("Usr_Out1_Z")
-        .write("Usr_Out1_F")
-        .write("Sig_Lmt1_Z")
-        .write("Sig_Lmt1_F")
+        .reads({"COUT_Z", "COUT_F"})
+        .writes({"Usr_Out1_Z", "Usr_Out1_F", "Sig_Lmt1_Z", "Sig_Lmt1_F"})
         .moduleConfirmed();
     return e.frames();
 }
@@ -70,38 +48,14 @@ std::vector<Frame> readingOrder() {
     e.read("Mod_Type")
         .read("Buss_ID")
         .fileName(true)
-        .read("TypInput")
-        .read("Type_In_Unit")
-        .read("In_Rng1")
-        .read("Meas_Unit_Z")
-        .read("Meas_Unit_F")
-        .read("Eng_In_F")
-        .read("Eng_In_Z")
-        .read("in_ch")
-        .read("in_res")
-        .read("Flag_A")
-        .read("Out_Rng1")
-        .read("Usr_Out1_Z")
-        .read("Usr_Out1_F")
-        .read("Sig_Lmt1_Z")
-        .read("Sig_Lmt1_F")
-        .read("COUT_Z")
-        .read("COUT_F")
-        .read("Aux_C")
-        .read("IS_ZS1")
-        .read("IS_FS1")
-        .read("IS_ZS2")
-        .read("IS_FS2")
-        .read("Eng_Unit1")
-        .read("Eng_Unit2")
-        .read("Eng_Unit3")
-        .read("Eng_Unit4")
-        .read("Orig_OS_PWM")
-        .read("Orig_FlagA")
-        .read("Gain_Factor")
+        .reads({"TypInput",  "Type_In_Unit", "In_Rng1",    "Meas_Unit_Z", "Meas_Unit_F",
+                "Eng_In_F",  "Eng_In_Z",     "in_ch",      "in_res",      "Flag_A",
+                "Out_Rng1",  "Usr_Out1_Z",   "Usr_Out1_F", "Sig_Lmt1_Z",  "Sig_Lmt1_F",
+                "COUT_Z",    "COUT_F",       "Aux_C",      "IS_ZS1",      "IS_FS1",
+                "IS_ZS2",    "IS_FS2",       "Eng_Unit1",  "Eng_Unit2",   "Eng_Unit3",
+                "Eng_Unit4", "Orig_OS_PWM",  "Orig_FlagA", "Gain_Factor"})
         .table1(true)
-        .read("Input_B4_Table")
-        .read("Int_Temp")
+        .reads({"Input_B4_Table", "Int_Temp"})
         .moduleConfirmed();
     return e.frames();
 }

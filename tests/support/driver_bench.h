@@ -62,6 +62,17 @@ public:
         data(name);
         return read(name);
     }
+    // Several steps of one kind in a row.
+    Expect& reads(std::initializer_list<const char*> names) {
+        for (const char* name : names)
+            read(name);
+        return *this;
+    }
+    Expect& writes(std::initializer_list<const char*> names) {
+        for (const char* name : names)
+            write(name);
+        return *this;
+    }
     Expect& fileName(bool reading = false) {
         for (int id = 16; id <= 32; id += 4)
             frames_.push_back({reading ? 'R' : 'W', id, at("File_Name")});
