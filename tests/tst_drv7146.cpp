@@ -1,7 +1,6 @@
 #include "drivers/kv7146_flags.h"
 #include "drivers/kv7146v1_driver.h"
 #include "drivers/kv7146v2_driver.h"
-#include "model/linearisation.h"
 #include "tests/support/driver_bench.h"
 
 #include <QtTest>
@@ -50,12 +49,6 @@ SettingsSet kv716v1Record() {
     return s;
 }
 
-void curveTable(SettingsSet& s) {
-    for (int i = 0; i <= Table1LastUsed; ++i)
-        s.Table1[i] = i * i;
-    TableChecksum(s.Table1.data(), Table1LastUsed);
-}
-
 SettingsSet kv714v2Record() {
     SettingsSet s;
     s.BussIdenti = 21;
@@ -75,7 +68,7 @@ SettingsSet kv714v2Record() {
     s.UserLmtEna = 1;
     s.RemoteCont = 1;
     s.Inp1Shape = QStringLiteral("Table");
-    curveTable(s);
+    drvbench::curveTable(s);
     return s;
 }
 

@@ -1,7 +1,6 @@
 #include "drivers/kv718_driver.h"
 #include "drivers/kv718_input.h"
 #include "model/codec.h"
-#include "model/linearisation.h"
 #include "tests/support/diagnostic_capture.h"
 #include "tests/support/driver_bench.h"
 
@@ -72,9 +71,7 @@ SettingsSet kv718Record(const QString& unit, float lo, float hi) {
     s.Out1SigLmF = 20.5f;
     s.Inp1Respon = 1;
     s.DirecrReve = 1;
-    for (int i = 0; i <= Table1LastUsed; ++i)
-        s.Table1[i] = i * i;
-    TableChecksum(s.Table1.data(), Table1LastUsed);
+    drvbench::curveTable(s);
     return s;
 }
 

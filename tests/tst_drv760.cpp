@@ -2,7 +2,6 @@
 #include "drivers/kv760_input.h"
 #include "drivers/step_runner.h"
 #include "engine/request_engine.h"
-#include "model/linearisation.h"
 #include "tests/support/driver_bench.h"
 
 #include <QtTest>
@@ -82,9 +81,7 @@ SettingsSet kv760Record() {
     s.Out1EngFul = 20;
     s.Out1SigLmZ = 3.8f;
     s.Out1SigLmF = 20.5f;
-    for (int i = 0; i <= Table1LastUsed; ++i)
-        s.Table1[i] = i * i;  // a curve, so that a table read back from elsewhere shows
-    TableChecksum(s.Table1.data(), Table1LastUsed);
+    drvbench::curveTable(s);
     return s;
 }
 
@@ -149,10 +146,8 @@ private slots:
     void refusedInput();
     void triggerBand_data();
     void triggerBand();
-    void loadingBit_data();
-    void loadingBit();
-    void optionBits_data();
-    void optionBits();
+    void flagWord_data();
+    void flagWord();
     void excitationCounts_data();
     void excitationCounts();
     void readBackGivesTheRecord_data();
@@ -256,44 +251,33 @@ void TestDrv760::triggerBand() {
     QTEST(input.trigLevel, "count");
 }
 
-void TestDrv760::loadingBit_data() {
+void TestDrv760::flagWord_data() {
+    // At 5 V, in the plain band but for the HI pulse input, which divides it.
     QTest::addColumn<int>("sensor");
     QTest::addColumn<int>("loading");
-    QTest::addColumn<bool>("bit");
-    QTest::newRow("NPN") << 1 << 1 << false;
-    QTest::newRow("PNP") << 2 << 0 << true;
-    QTest::newRow("NAMUR") << 3 << 0 << true;
-    QTest::newRow("2 wire") << 4 << 0 << true;
-    QTest::newRow("inductive, no load") << 5 << 0 << false;
-    QTest::newRow("inductive, loaded") << 5 << 1 << true;
-    QTest::newRow("any pulse") << 6 << 1 << false;
-    QTest::newRow("HI pulse") << 7 << 0 << true;
-}
-
-void TestDrv760::loadingBit() {
-    QFETCH(int, sensor);
-    QFETCH(int, loading);
-    SettingsSet s = record(sensor, 5);
-    s.Typ1InRes = loading;
-    KV760Input input;
-    QString message;
-    QVERIFY(KV760StartValues(s, factory(), input, message));
-    QTEST(bool(input.flagA & 0x4), "bit");
-}
-
-void TestDrv760::optionBits_data() {
     QTest::addColumn<int>("options");
     QTest::addColumn<int>("flags");
-    QTest::newRow("response") << 0x01 << 0x08;
-    QTest::newRow("remote") << 0x02 << 0x10;
-    QTest::newRow("reverse") << 0x04 << 0x20;
-    QTest::newRow("limits") << 0x08 << 0x40;
-    QTest::newRow("track") << 0x10 << 0x80;
+    QTest::newRow("NPN") << 1 << 1 << 0 << 0x00;
+    QTest::newRow("PNP") << 2 << 0 << 0 << 0x04;
+    QTest::newRow("NAMUR") << 3 << 0 << 0 << 0x04;
+    QTest::newRow("2 wire") << 4 << 0 << 0 << 0x04;
+    QTest::newRow("inductive, no load") << 5 << 0 << 0 << 0x00;
+    QTest::newRow("inductive, loaded") << 5 << 1 << 0 << 0x04;
+    QTest::newRow("any pulse") << 6 << 1 << 0 << 0x00;
+    QTest::newRow("HI pulse") << 7 << 0 << 0 << 0x07;
+    QTest::newRow("response") << 1 << 0 << 0x01 << 0x08;
+    QTest::newRow("remote") << 1 << 0 << 0x02 << 0x10;
+    QTest::newRow("reverse") << 1 << 0 << 0x04 << 0x20;
+    QTest::newRow("limits") << 1 << 0 << 0x08 << 0x40;
+    QTest::newRow("track") << 1 << 0 << 0x10 << 0x80;
 }
 
-void TestDrv760::optionBits() {
+void TestDrv760::flagWord() {
+    QFETCH(int, sensor);
+    QFETCH(int, loading);
     QFETCH(int, options);
-    SettingsSet s = record(1, 5);  // plain band, no load: no other bit
+    SettingsSet s = record(sensor, 5);
+    s.Typ1InRes = loading;
     setOptions(s, options);
     KV760Input input;
     QString message;

@@ -127,9 +127,7 @@ SettingsSet potentiometer() {
     s.Inp1mU_Zro = 10;
     s.Inp1mU_Ful = 90;
     s.DirecrReve = 1;
-    for (int i = 0; i <= Table1LastUsed; ++i)
-        s.Table1[i] = i * i;
-    TableChecksum(s.Table1.data(), Table1LastUsed);
+    drvbench::curveTable(s);
     return s;
 }
 

@@ -7,6 +7,7 @@
 #include "drivers/module_run.h"
 #include "engine/diagnostics.h"
 #include "engine/module_connection.h"
+#include "model/linearisation.h"
 #include "model/register_map.h"
 #include "sim/simulator.h"
 
@@ -195,6 +196,13 @@ private:
         return module;
     }
 };
+
+// Table 1 as a curve, so that a table read back from elsewhere shows.
+inline void curveTable(kv::SettingsSet& s) {
+    for (int i = 0; i <= kv::Table1LastUsed; ++i)
+        s.Table1[i] = i * i;
+    kv::TableChecksum(s.Table1.data(), kv::Table1LastUsed);
+}
 
 // Compares the frames sent with the expected ones, naming the first difference.
 inline bool sameFrames(const std::vector<Frame>& sent, const std::vector<Frame>& expected,
