@@ -1,12 +1,20 @@
 // Self-checks of every driver's order tables: the registers they name, how the
 // orders start and end, that each acknowledgement leads to exactly one row,
-// and that multi-part transfers are complete.
+// and that multi-part transfers are complete; and the drivers' descriptors
+// against what their modules are documented to do.
 #include "drivers/driver_list.h"
+#include "drivers/kv7146v1_driver.h"
+#include "drivers/kv7146v2_driver.h"
+#include "drivers/kv718_driver.h"
+#include "drivers/kv760_driver.h"
+#include "drivers/step_runner.h"
+#include "engine/request_engine.h"
 #include "model/register_map.h"
 
 #include <QSet>
 #include <QtTest>
 
+#include <algorithm>
 #include <cstring>
 
 using namespace kv;
@@ -60,12 +68,32 @@ AckKind ackKindFor(RequestKind kind) {
     }
 }
 
-DriverDescriptor Kv720Like(int family, const char* window) {
-    DriverDescriptor driver = *AllDrivers().begin()[0];
-    driver.family = family;
-    driver.run.window = window;
-    return driver;
-}
+struct Documented {
+    const DriverDescriptor& (*driver)();
+    const char* module;
+    const char* dispatcher;
+    int family;
+    const char* setTag;
+    const char* getTag;
+    const char* lastProgrammed;
+    const char* lastProgrammedText;  // its description in a failure text
+    const char* lastRead;
+};
+
+const Documented documented[] = {
+    {Kv760Driver, "modKV760v1", "GS760", 6, "modKV760.cbSet", "modKV760.cbGet", "Remote1",
+     "Remote Output 1", "Int_Temp"},
+    {Kv714v1Driver, "modKV7146v1", "GS714v1", 1, "modKV7146v1.cbSet", "GS7146v1.cbGet", "Buss_ID",
+     "BUSS ID", "Int_Temp"},
+    {Kv716v1Driver, "modKV7146v1", "GS716v1", 2, "modKV7146v1.cbSet", "GS7146v1.cbGet", "Buss_ID",
+     "BUSS ID", "Int_Temp"},
+    {Kv714v2Driver, "modKV7146v2", "GS714v2", 4, "modKV7146v2.cbSet", "GS7146v2.cbGet", "Buss_ID",
+     "BUSS ID", "Int_Temp"},
+    {Kv716v2Driver, "modKV7146v2", "GS716v2", 5, "modKV7146v2.cbSet", "GS7146v2.cbGet", "Buss_ID",
+     "BUSS ID", "Int_Temp"},
+    {Kv718Driver, "modKV718vA", "GS718vA", 7, "modKV718vA.cbSet", "GS718vA.cbGet", "Buss_ID",
+     "BUSS ID", "Int_Temp"},
+};
 
 }  // namespace
 
@@ -81,6 +109,8 @@ private slots:
     void valuesMatchTheRegisterWidth();
     void multiPartRegistersUseTheirTransfers();
     void driverListIsConsistent();
+    void descriptors_data();
+    void descriptors();
     void windowPicksItsDriverByMap();
 };
 
@@ -121,6 +151,8 @@ void TestDriverTables::ordersEndOnTheirLastRegister() {
         }
         QVERIFY2(requests == 1, where(order) + " requests its last register " +
                                     QByteArray::number(requests) + " times");
+        QVERIFY2((order.rows.end() - 1)->next.reg.isSameAs(order.last),
+                 where(order) + " does not end on its last register");
     }
 }
 
@@ -155,14 +187,19 @@ void TestDriverTables::everyRowIsReached() {
 
 void TestDriverTables::repeatedAcknowledgementsAreToldApart() {
     // Rows that acknowledge the same register are tried in order: every one
-    // but the last needs a condition, or the later ones are never taken.
+    // but the last needs a condition, or the later ones are never taken. Two
+    // registers of one order must not share an address in the family's map.
     for (const Order& order : allOrders()) {
+        const RegMap map = RegMapFor(order.driver->family);
         for (const StepRow* row = order.rows.begin(); row != order.rows.end(); ++row) {
             for (const StepRow* later = row + 1; later != order.rows.end(); ++later) {
                 if (later->ack.reg.isSameAs(row->ack.reg))
                     QVERIFY2(row->ack.when != nullptr,
                              where(order, int(row - order.rows.begin())) + " hides row " +
                                  QByteArray::number(int(later - order.rows.begin()) + 1));
+                else
+                    QVERIFY2(row->ack.reg.address(map) != later->ack.reg.address(map),
+                             where(order, int(row - order.rows.begin())) + " shares its address");
             }
         }
     }
@@ -238,17 +275,47 @@ void TestDriverTables::driverListIsConsistent() {
     QCOMPARE(DriverForMap(UnknownModuleMap), nullptr);
 }
 
+void TestDriverTables::descriptors_data() {
+    QTest::addColumn<int>("row");
+    for (int i = 0; i < int(std::size(documented)); ++i)
+        QTest::newRow(documented[i].dispatcher) << i;
+}
+
+void TestDriverTables::descriptors() {
+    QFETCH(int, row);
+    const Documented& doc = documented[row];
+    const DriverDescriptor& d = doc.driver();
+    QCOMPARE(d.module, doc.module);
+    QCOMPARE(d.dispatcher, doc.dispatcher);
+    QCOMPARE(d.family, doc.family);
+    QCOMPARE(d.setTag, doc.setTag);
+    QCOMPARE(d.getTag, doc.getTag);
+    QCOMPARE(d.lastProgrammed.name(), doc.lastProgrammed);
+    QCOMPARE(d.lastRead.name(), doc.lastRead);
+    const DriverList all = AllDrivers();
+    QVERIFY(std::find(all.begin(), all.end(), &d) != all.end());
+
+    // The window, not the driver, handles the last register of a programming run.
+    SetRegMap(RegAdd, d.family);
+    RequestEngine engine;
+    SettingsSet settings;
+    QString text;
+    QVERIFY(!ProgramStep(d, engine, d.lastProgrammed.address(RegAdd), 16, text, settings));
+    QCOMPARE(text, QStringLiteral("PROGRAM FAIL %1: cbSet RegAdd.%2 End process on calling form")
+                       .arg(doc.lastProgrammedText, doc.lastProgrammed));
+}
+
 void TestDriverTables::windowPicksItsDriverByMap() {
-    // Two drivers behind one window, and a third window with a single driver.
-    DriverDescriptor first = Kv720Like(1, "frmPair");
-    DriverDescriptor second = Kv720Like(2, "frmPair");
-    DriverDescriptor single = Kv720Like(6, "frmSingle");
-    const DriverDescriptor* const list[] = {&first, &second, &single};
-    const DriverList drivers{list, 3};
-    QCOMPARE(WindowDriverForMap(drivers, first, 2), &second);
-    QCOMPARE(WindowDriverForMap(drivers, second, 1), &first);
-    QCOMPARE(WindowDriverForMap(drivers, first, 6), nullptr);   // the window's unknown map text
-    QCOMPARE(WindowDriverForMap(drivers, single, 1), &single);  // its model check speaks
+    // The KV718 "-10"/"-20" share the second-version KV714 map and so its driver.
+    QCOMPARE(WindowDriverForMap(Kv716v1Driver(), 1), &Kv714v1Driver());
+    QCOMPARE(WindowDriverForMap(Kv714v1Driver(), 2), &Kv716v1Driver());
+    QCOMPARE(WindowDriverForMap(Kv716v2Driver(), 4), &Kv714v2Driver());
+    QCOMPARE(WindowDriverForMap(Kv714v2Driver(), 5), &Kv716v2Driver());
+    // A window with several drivers has none for a foreign map; one with a
+    // single driver keeps it, and its model check names the wrong module.
+    QCOMPARE(WindowDriverForMap(Kv714v1Driver(), 4), nullptr);
+    QCOMPARE(WindowDriverForMap(Kv714v2Driver(), 2), nullptr);
+    QCOMPARE(WindowDriverForMap(Kv760Driver(), 3), &Kv760Driver());
 }
 
 QTEST_GUILESS_MAIN(TestDriverTables)

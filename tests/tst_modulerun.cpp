@@ -3,100 +3,65 @@
 // the serial link. The module's frame log is held against the documented order.
 #include "drivers/kv720_codes.h"
 #include "drivers/kv720_driver.h"
-#include "drivers/module_run.h"
-#include "engine/module_connection.h"
-#include "engine/request_engine.h"
 #include "model/codec.h"
 #include "model/linearisation.h"
-#include "model/register_map.h"
-#include "sim/simulator.h"
+#include "tests/support/driver_bench.h"
 
 #include <QSignalSpy>
-#include <QTemporaryDir>
 #include <QtTest>
 
 using namespace kv;
-using namespace kv::sim;
+using drvbench::Bench;
+using drvbench::Expect;
+using drvbench::Frame;
 
 Q_DECLARE_METATYPE(kv::SettingsSet)
 
 namespace {
 
 constexpr int Kv720Map = 3;
-constexpr int RunWaitMs = 60000;
-const QString windowTag = QStringLiteral("MCT00001");
 
-// The KV720's programming order as the module sees it: "W reg" is a write and
-// its read-back, "D reg id" one part written with that bus ID, "R reg" a read,
-// "T reg first-last" the parts of a table. "TC" rows belong to thermocouples only.
-const char* const programmingOrder[] = {
-    "R Mod_Type",     "W TypInput",        "D File_Name 16", "D File_Name 20",  "D File_Name 24",
-    "D File_Name 28", "D File_Name 32",    "W Eng_Unit1",    "W Eng_Unit2",     "W Eng_Unit3",
-    "W Eng_Unit4",    "W Eng_In_Z",        "W Eng_In_F",     "W Meas_Unit_Z",   "W Meas_Unit_F",
-    "W Buss_ID",      "W In_Rng1",         "W in_ch",        "W in_res",        "W Type_In_Unit",
-    "R CIN_Z",        "R CIN_F",           "R SLOP_P",       "R SLOP_N",        "W Usr_In1_Z",
-    "W Usr_In1_F",    "W Aux_C",           "W Flag_A",       "W Orig_OS_PWM",   "W Orig_FlagA",
-    "W Gain_Factor",  "TC T TableC 16-66", "TC R Term_Temp", "T Table1 16-116", "R Input_B4_Table",
-    "W Out_Rng1",     "R COUT_Z",          "R COUT_F",       "W Usr_Out1_Z",    "W Usr_Out1_F",
-    "W Sig_Lmt1_Z",   "W Sig_Lmt1_F",
-    "R Serial_No",  // the run's check that the module is still the one it started on
-};
-
-const char* const readingOrder[] = {
-    "R Mod_Type",     "R Buss_ID",        "R File_Name 16",   "R File_Name 20", "R File_Name 24",
-    "R File_Name 28", "R File_Name 32",   "R TypInput",       "R Type_In_Unit", "R In_Rng1",
-    "R Meas_Unit_Z",  "R Meas_Unit_F",    "R Eng_In_F",       "R Eng_In_Z",     "R in_ch",
-    "R in_res",       "R Flag_A",         "R Out_Rng1",       "R Usr_Out1_Z",   "R Usr_Out1_F",
-    "R Sig_Lmt1_Z",   "R Sig_Lmt1_F",     "R COUT_Z",         "R COUT_F",       "R Aux_C",
-    "R IS_ZS1",       "R IS_FS1",         "R IS_ZS2",         "R IS_FS2",       "R Eng_Unit1",
-    "R Eng_Unit2",    "R Eng_Unit3",      "R Eng_Unit4",      "R Orig_OS_PWM",  "R Orig_FlagA",
-    "R Gain_Factor",  "RT Table1 16-116", "R Input_B4_Table", "R Int_Temp",     "R Serial_No",
-};
-
-struct Frame {
-    char command;
-    int busId;
-    int address;
-    bool operator==(const Frame& o) const {
-        return command == o.command && busId == o.busId && address == o.address;
-    }
-};
-
-QString show(const Frame& f) {
-    return QStringLiteral("%1 %2 id %3").arg(QChar(f.command)).arg(f.address).arg(f.busId);
+std::vector<Frame> programmingOrder(bool thermocouple) {
+    Expect e(Kv720Map);
+    e.read("Mod_Type")
+        .write("TypInput")
+        .fileName()
+        .writes({"Eng_Unit1", "Eng_Unit2", "Eng_Unit3", "Eng_Unit4", "Eng_In_Z", "Eng_In_F",
+                 "Meas_Unit_Z", "Meas_Unit_F", "Buss_ID", "In_Rng1", "in_ch", "in_res",
+                 "Type_In_Unit"})
+        .reads({"CIN_Z", "CIN_F", "SLOP_P", "SLOP_N"})
+        .writes({"Usr_In1_Z", "Usr_In1_F", "Aux_C", "Flag_A", "Orig_OS_PWM", "Orig_FlagA",
+                 "Gain_Factor"});
+    if (thermocouple)
+        e.tableC().read("Term_Temp");
+    e.table1()
+        .read("Input_B4_Table")
+        .write("Out_Rng1")
+        .reads({"COUT_Z", "COUT_F"})
+        .writes({"Usr_Out1_Z", "Usr_Out1_F", "Sig_Lmt1_Z", "Sig_Lmt1_F"})
+        .moduleConfirmed();
+    return e.frames();
 }
 
-int addressOf(const QString& name) {
-    const RegMap map = RegMapFor(Kv720Map);
-    for (const RegisterRow& row : AllRegisters())
-        if (name == QLatin1String(row.field.name()))
-            return row.field.address(map);
-    qFatal("no register %s", qPrintable(name));
+std::vector<Frame> readingOrder() {
+    Expect e(Kv720Map);
+    e.read("Mod_Type")
+        .read("Buss_ID")
+        .fileName(true)
+        .reads({"TypInput",  "Type_In_Unit", "In_Rng1",    "Meas_Unit_Z", "Meas_Unit_F",
+                "Eng_In_F",  "Eng_In_Z",     "in_ch",      "in_res",      "Flag_A",
+                "Out_Rng1",  "Usr_Out1_Z",   "Usr_Out1_F", "Sig_Lmt1_Z",  "Sig_Lmt1_F",
+                "COUT_Z",    "COUT_F",       "Aux_C",      "IS_ZS1",      "IS_FS1",
+                "IS_ZS2",    "IS_FS2",       "Eng_Unit1",  "Eng_Unit2",   "Eng_Unit3",
+                "Eng_Unit4", "Orig_OS_PWM",  "Orig_FlagA", "Gain_Factor"})
+        .table1(true)
+        .reads({"Input_B4_Table", "Int_Temp"})
+        .moduleConfirmed();
+    return e.frames();
 }
 
-QList<Frame> expectedFrames(const char* const* order, int count, bool thermocouple) {
-    QList<Frame> frames;
-    for (int i = 0; i < count; ++i) {
-        QStringList words = QString(order[i]).split(' ');
-        if (words[0] == "TC") {
-            if (!thermocouple)
-                continue;
-            words.removeFirst();
-        }
-        const int address = addressOf(words[1]);
-        if (words[0] == "W") {
-            frames << Frame{'W', 16, address} << Frame{'R', 16, address};
-        } else if (words[0] == "R") {
-            frames << Frame{'R', words.size() > 2 ? words[2].toInt() : 16, address};
-        } else if (words[0] == "D") {
-            frames << Frame{'W', words[2].toInt(), address};
-        } else {
-            const QStringList ends = words[2].split('-');
-            for (int id = ends[0].toInt(); id <= ends[1].toInt(); id += 2)
-                frames << Frame{words[0] == "T" ? 'W' : 'R', id, address};
-        }
-    }
-    return frames;
+int addressOf(const char* name) {
+    return drvbench::addressOf(name, Kv720Map);
 }
 
 SettingsSet milliVolts() {
@@ -162,9 +127,7 @@ SettingsSet potentiometer() {
     s.Inp1mU_Zro = 10;
     s.Inp1mU_Ful = 90;
     s.DirecrReve = 1;
-    for (int i = 0; i <= Table1LastUsed; ++i)
-        s.Table1[i] = i * i;
-    TableChecksum(s.Table1.data(), Table1LastUsed);
+    drvbench::curveTable(s);
     return s;
 }
 
@@ -183,183 +146,66 @@ SettingsSet resistance() {
     return s;
 }
 
-float singleAt(const Simulator& sim, const char* name) {
-    return WireToSingle(LongToWire(sim.registerValue(addressOf(name))));
+sim::ModuleIdentity module(const char* model = "KV720-20", qint32 serial = 100001) {
+    sim::ModuleIdentity identity;
+    sim::ParseModel(model, identity);
+    identity.serial = serial;
+    return identity;
 }
 
-// One simulated KV720 on its own COM port, connected and identified.
-class Bench {
-public:
-    explicit Bench(ModuleIdentity module = {}, qint32 cinF = 6880) : sim(optionsFor(module)) {
-        QString error;
-        ok = sim.start(error) && sim.publishAsPort(port, error);
-        // G = 5680 counts over a range, so that table C fits its 16 bits.
-        if (ok && FamilyOfType(module.typeCode) == Kv720Map)
-            sim.setRegisterValue(addressOf("CIN_F"), cinF);
-        connection.engine().setPort(port);
-        QSignalSpy identified(&connection, &ModuleConnection::runMode);
-        ok = ok && connection.OpenCom(true, error);
-        connection.startTimer(1);
-        ok = ok && identified.wait(30000);
-        if (!ok)
-            qWarning() << "bench:" << error;
+// A KV720 identified and idle. Its input gain G = CIN_F - CIN_Z counts over a
+// range; the default 5680 keeps table C within its 16 bits.
+struct Kv720Bench : Bench {
+    explicit Kv720Bench(const sim::ModuleIdentity& identity = module(), qint32 cinF = 6880)
+        : Bench(identity) {
+        sim->setRegisterValue(addressOf("CIN_F"), cinF);
+        identified = ready();
     }
-
-    // The frames the module received since the last mark.
-    QList<Frame> framesSinceMark() const {
-        QList<Frame> frames;
-        for (const SimLogEntry& entry : sim.log())
-            if (entry.kind == SimLogEntry::Request && entry.sequence > mark)
-                frames << Frame{entry.command, entry.busId, entry.address};
-        return frames;
-    }
-    // Positions of the unanswered frames among those since the mark.
-    QList<int> droppedSinceMark() const {
-        QList<int> dropped;
-        int position = 0;
-        for (const SimLogEntry& entry : sim.log()) {
-            if (entry.kind != SimLogEntry::Request || entry.sequence <= mark)
-                continue;
-            if (entry.outcome == SimLogEntry::Dropped)
-                dropped << position;
-            ++position;
-        }
-        return dropped;
-    }
-    void setMark() {
-        const std::vector<SimLogEntry> log = sim.log();
-        mark = log.empty() ? 0 : log.back().sequence;
-    }
-
-    struct Outcome {
-        bool ended = false;
-        bool ok = false;
-        QString text;
-        QList<Frame> frames;  // received from the start of the run to its end
-    };
-
-    Outcome program(ModuleRun& run, const SettingsSet& settings) {
-        return runToEnd(run, [&](QString& error) {
-            return run.startProgramming(Kv720Driver(), settings, error);
-        });
-    }
-    Outcome read(ModuleRun& run) {
-        return runToEnd(run,
-                        [&](QString& error) { return run.startReading(Kv720Driver(), {}, error); });
-    }
-
-    Simulator sim;
-    qint16 port = nextPort++;
-    ModuleConnection connection;
-    bool ok = false;
-    qint64 mark = 0;
-
-private:
-    static SimOptions optionsFor(const ModuleIdentity& module) {
-        SimOptions options;
-        options.module = module;
-        return options;
-    }
-
-    template <typename Start>
-    Outcome runToEnd(ModuleRun& run, Start start) {
-        Outcome outcome;
-        QSignalSpy finished(&run, &ModuleRun::finished);
-        // The frames up to the end: the live polling starts again right after it.
-        QList<Frame> frames;
-        QObject::connect(&run, &ModuleRun::finished, &run, [&] { frames = framesSinceMark(); });
-        QString error;
-        if (!start(error)) {
-            outcome.text = error;
-            return outcome;
-        }
-        // The run's first request goes out on the next tick; a poll that the
-        // reservation waited for is already logged.
-        setMark();
-        outcome.ended = finished.wait(RunWaitMs);
-        if (outcome.ended) {
-            outcome.ok = finished.at(0).at(0).toBool();
-            outcome.text = finished.at(0).at(1).toString();
-        }
-        outcome.frames = frames;
-        return outcome;
-    }
-
-    static inline qint16 nextPort = 1;
+    explicit Kv720Bench(const sim::SimFaults& faults) : Kv720Bench() { sim->setFaults(faults); }
+    bool identified = false;
 };
-
-ModuleIdentity kv720(qint32 serial = 100001) {
-    ModuleIdentity module;
-    ParseModel("KV720-20", module);
-    module.serial = serial;
-    return module;
-}
-
-void compareFrames(const QList<Frame>& actual, const QList<Frame>& expected) {
-    const int common = int(qMin(actual.size(), expected.size()));
-    for (int i = 0; i < common; ++i)
-        QVERIFY2(actual[i] == expected[i], qPrintable(QStringLiteral("frame %1: %2, expected %3")
-                                                          .arg(i)
-                                                          .arg(show(actual[i]))
-                                                          .arg(show(expected[i]))));
-    QCOMPARE(actual.size(), expected.size());
-}
 
 }  // namespace
 
 class TestModuleRun : public QObject {
     Q_OBJECT
 private slots:
-    void initTestCase();
-
     void programmingFollowsTheOrder_data();
     void programmingFollowsTheOrder();
     void programmedRegisters();
     void programThenReadBack_data();
     void programThenReadBack();
-    void readingFollowsTheOrder();
 
     void wrongModel();
     void inputOutOfRange();
     void secondRunRefused();
     void droppedReplyIsRetried();
+    void deadModuleEndsTheRun_data();
     void deadModuleEndsTheRun();
-    void deadModuleEndsARead();
     void disconnectEndsTheRun();
     void swappedModuleIsNotProgrammed();
-
-private:
-    QTemporaryDir portDir_;
 };
-
-void TestModuleRun::initTestCase() {
-    QVERIFY(portDir_.isValid());
-    qputenv("KV700_PORT_DIR", portDir_.path().toLocal8Bit());
-}
 
 void TestModuleRun::programmingFollowsTheOrder_data() {
     QTest::addColumn<SettingsSet>("settings");
     QTest::addColumn<bool>("thermocouple");
     QTest::newRow("mV") << milliVolts() << false;
     QTest::newRow("thermocouple") << thermocouple() << true;
-    QTest::newRow("RTD") << rtd() << false;
 }
 
 void TestModuleRun::programmingFollowsTheOrder() {
     QFETCH(SettingsSet, settings);
     QFETCH(bool, thermocouple);
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
-    QSignalSpy progress(&run, &ModuleRun::progress);
-    QSignalSpy status(&run, &ModuleRun::statusChanged);
-    const Bench::Outcome outcome = bench.program(run, settings);
-    QVERIFY(outcome.ended);
-    QVERIFY2(outcome.ok, qPrintable(outcome.text));
-    QCOMPARE(outcome.text, QString("Programmed"));
+    Kv720Bench bench;
+    QVERIFY(bench.identified);
+    QSignalSpy progress(&bench.run, &ModuleRun::progress);
+    QSignalSpy status(&bench.run, &ModuleRun::statusChanged);
+    QVERIFY2(bench.program(Kv720Driver(), settings), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString("Programmed"));
     QCOMPARE(status.first().at(0).toString(), QString("Programming.."));
-    compareFrames(outcome.frames,
-                  expectedFrames(programmingOrder, int(std::size(programmingOrder)), thermocouple));
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, programmingOrder(thermocouple), difference),
+             qPrintable(difference));
 
     // Progress runs from step 0 to the last step, never backwards.
     int last = -1;
@@ -373,20 +219,18 @@ void TestModuleRun::programmingFollowsTheOrder() {
 }
 
 void TestModuleRun::programmedRegisters() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    bench.sim.setRegisterValue(addressOf("CIN_F"), 58000);  // G = 56800
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome outcome = bench.program(run, milliVolts());
-    QVERIFY2(outcome.ok, qPrintable(outcome.text));
-    const Simulator& sim = bench.sim;
+    Kv720Bench bench(module(), 58000);  // G = 56800
+    QVERIFY(bench.identified);
+    QVERIFY2(bench.program(Kv720Driver(), milliVolts()), qPrintable(bench.result));
+    const sim::Simulator& sim = *bench.sim;
     auto value = [&](const char* name) { return sim.registerValue(addressOf(name)); };
+    auto single = [&](const char* name) { return WireToSingle(LongToWire(value(name))); };
     QCOMPARE(value("TypInput"), 1);
     QCOMPARE(sim.fileName(), QByteArray("PUMP 3 INLET        "));
     QCOMPARE(value("Eng_Unit1"), int('k'));
     QCOMPARE(value("Eng_Unit4"), int(' '));
-    QCOMPARE(singleAt(sim, "Eng_In_F"), 250.0f);
-    QCOMPARE(singleAt(sim, "Meas_Unit_F"), 20.0f);
+    QCOMPARE(single("Eng_In_F"), 250.0f);
+    QCOMPARE(single("Meas_Unit_F"), 20.0f);
     QCOMPARE(value("Buss_ID"), 7);
     QCOMPARE(value("In_Rng1"), 4);  // 0-20 mV
     QCOMPARE(value("in_ch"), 3);
@@ -425,204 +269,153 @@ void TestModuleRun::programThenReadBack_data() {
 
 void TestModuleRun::programThenReadBack() {
     QFETCH(SettingsSet, settings);
-    Bench bench(kv720(123456));
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome programmed = bench.program(run, settings);
-    QVERIFY2(programmed.ok, qPrintable(programmed.text));
-    const SettingsSet sent = run.settings();
-    const Bench::Outcome read = bench.read(run);
-    QVERIFY2(read.ok, qPrintable(read.text));
-    QCOMPARE(read.text, QString("KV720-20 Settings Read.."));
-    QCOMPARE(run.warning(), QString());
-    const SettingsSet& got = run.settings();
+    Kv720Bench bench(module("KV720-20", 123456));
+    QVERIFY(bench.identified);
+    QVERIFY2(bench.program(Kv720Driver(), settings), qPrintable(bench.result));
+    const SettingsSet sent = bench.run.settings();
+    QSignalSpy status(&bench.run, &ModuleRun::statusChanged);
+    QVERIFY2(bench.read(Kv720Driver(), {}), qPrintable(bench.result));
+    QCOMPARE(bench.result, QString("KV720-20 Settings Read.."));
+    QCOMPARE(status.first().at(0).toString(), QString("Read program from connected module . . ."));
+    QCOMPARE(bench.run.warning(), QString());
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(bench.sent, readingOrder(), difference), qPrintable(difference));
 
+    const SettingsSet& got = bench.run.settings();
     QCOMPARE(got.ModTypeSet, 4);
     QCOMPARE(got.SerialNumb, 123456);
-    QCOMPARE(got.FileName, sent.FileName);
-    QCOMPARE(got.BussIdenti, sent.BussIdenti);
-    QCOMPARE(got.Inp1RngTyp, sent.Inp1RngTyp);
-    QCOMPARE(got.Inp1RngSet, sent.Inp1RngSet);
-    QCOMPARE(got.Typ1InUnit, sent.Typ1InUnit);
-    QCOMPARE(got.Inp1MeUnit, sent.Inp1MeUnit);
-    QCOMPARE(got.Inp1Shape, sent.Inp1Shape);
-    QCOMPARE(got.Inp1mU_Zro, sent.Inp1mU_Zro);
-    QCOMPARE(got.Inp1mU_Ful, sent.Inp1mU_Ful);
-    QCOMPARE(got.Inp1EngZro, sent.Inp1EngZro);
-    QCOMPARE(got.Inp1EngFul, sent.Inp1EngFul);
-    QCOMPARE(got.Inp1EngUnt, sent.Inp1EngUnt);
-    QCOMPARE(got.Typ1Differ, sent.Typ1Differ);
-    QCOMPARE(got.Typ1InRes, sent.Typ1InRes);
-    QCOMPARE(got.RemoteCont, sent.RemoteCont);
-    QCOMPARE(got.Inp1Respon, sent.Inp1Respon);
-    QCOMPARE(got.UserLmtEna, sent.UserLmtEna);
-    QCOMPARE(got.DirecrReve, sent.DirecrReve);
-    QCOMPARE(got.Inp1BurnOut, sent.Inp1BurnOut);
     QCOMPARE(got.MinorTrim, 0);
-    QCOMPARE(got.AuxIsI, sent.AuxIsI);
-    QCOMPARE(got.AuxVmA, sent.AuxVmA);
-    QCOMPARE(got.Out1RngTyp, sent.Out1RngTyp);
-    QCOMPARE(got.Out1EngZro, sent.Out1EngZro);
-    QCOMPARE(got.Out1EngFul, sent.Out1EngFul);
-    QCOMPARE(got.Out1SigLmZ, sent.Out1SigLmZ);
-    QCOMPARE(got.Out1SigLmF, sent.Out1SigLmF);
+    QVERIFY(drvbench::sameFields(
+        got, sent, {DRV_FIELD(FileName),    DRV_FIELD(BussIdenti), DRV_FIELD(Inp1RngTyp),
+                    DRV_FIELD(Inp1RngSet),  DRV_FIELD(Typ1InUnit), DRV_FIELD(Inp1MeUnit),
+                    DRV_FIELD(Inp1Shape),   DRV_FIELD(Inp1mU_Zro), DRV_FIELD(Inp1mU_Ful),
+                    DRV_FIELD(Inp1EngZro),  DRV_FIELD(Inp1EngFul), DRV_FIELD(Inp1EngUnt),
+                    DRV_FIELD(Typ1Differ),  DRV_FIELD(Typ1InRes),  DRV_FIELD(RemoteCont),
+                    DRV_FIELD(Inp1Respon),  DRV_FIELD(UserLmtEna), DRV_FIELD(DirecrReve),
+                    DRV_FIELD(Inp1BurnOut), DRV_FIELD(AuxIsI),     DRV_FIELD(AuxVmA),
+                    DRV_FIELD(Out1RngTyp),  DRV_FIELD(Out1EngZro), DRV_FIELD(Out1EngFul),
+                    DRV_FIELD(Out1SigLmZ),  DRV_FIELD(Out1SigLmF)}));
     QVERIFY(got.Table1 == sent.Table1);
 }
 
-void TestModuleRun::readingFollowsTheOrder() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
-    QSignalSpy status(&run, &ModuleRun::statusChanged);
-    const Bench::Outcome outcome = bench.read(run);
-    QVERIFY2(outcome.ok, qPrintable(outcome.text));
-    QCOMPARE(status.first().at(0).toString(), QString("Read program from connected module . . ."));
-    compareFrames(outcome.frames,
-                  expectedFrames(readingOrder, int(std::size(readingOrder)), false));
-    // The factory state: 0-20 mV linear in, 4-20 mA out of 0-20 mA.
-    QCOMPARE(run.settings().FileName, QString("FACTORY SETTINGS    "));
-    QCOMPARE(run.settings().Inp1RngSet, 4);
-    QCOMPARE(run.settings().Inp1Shape, QString("Linear"));
-    QCOMPARE(run.settings().Out1EngZro, 4.0f);
-    QCOMPARE(run.settings().Out1EngFul, 20.0f);
-}
-
 void TestModuleRun::wrongModel() {
-    ModuleIdentity module;
-    ParseModel("KV760-20", module);
-    Bench bench(module);
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome programmed = bench.program(run, milliVolts());
-    QVERIFY(programmed.ended);
-    QVERIFY(!programmed.ok);
-    QCOMPARE(programmed.text, QString("PROGRAM FAIL Module Type: KV760-20 is not KV720!"));
-    QCOMPARE(programmed.frames.size(), 1);  // the module type, nothing written
+    Kv720Bench bench(module("KV760-20"));
+    QVERIFY(bench.identified);
+    QVERIFY(!bench.program(Kv720Driver(), milliVolts()));
+    QVERIFY(bench.finished);
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Module Type: KV760-20 is not KV720!"));
+    QCOMPARE(bench.sent.size(), size_t(1));  // the module type, nothing written
 
-    const Bench::Outcome read = bench.read(run);
-    QVERIFY(!read.ok);
-    QCOMPARE(read.text, QString("Module Type - KV760-20 is not KV720! FAIL"));
+    QVERIFY(!bench.read(Kv720Driver(), {}));
+    QCOMPARE(bench.result, QString("Module Type - KV760-20 is not KV720! FAIL"));
     QVERIFY(!bench.connection.engine().reserved());
 }
 
 void TestModuleRun::inputOutOfRange() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
+    Kv720Bench bench;
+    QVERIFY(bench.identified);
     SettingsSet settings = milliVolts();
     settings.Inp1mU_Zro = 300;
     settings.Inp1mU_Ful = 350;
-    const Bench::Outcome outcome = bench.program(run, settings);
-    QVERIFY(!outcome.ok);
-    QCOMPARE(outcome.text, QString("PROGRAM FAIL BUSS ID: Maximum input 624mV and maximum offset "
+    QVERIFY(!bench.program(Kv720Driver(), settings));
+    QCOMPARE(bench.result, QString("PROGRAM FAIL BUSS ID: Maximum input 624mV and maximum offset "
                                    "is 50% of range.9"));
     // The run stops with the bus ID written: the range register keeps the factory range.
-    QCOMPARE(outcome.frames.last(), (Frame{'R', 16, addressOf("Buss_ID")}));
-    QCOMPARE(bench.sim.registerValue(addressOf("In_Rng1")), 4);
+    QCOMPARE(bench.sent.back(), (Frame{'R', 16, addressOf("Buss_ID")}));
+    QCOMPARE(bench.sim->registerValue(addressOf("In_Rng1")), 4);
 
     settings.Inp1mU_Zro = 0;
     settings.Inp1mU_Ful = 500.1f;
-    const Bench::Outcome early = bench.program(run, settings);
-    QCOMPARE(early.text, QString("PROGRAM FAIL Module Type: Maximum input range is 500mV"));
-    QCOMPARE(early.frames.size(), 1);
+    QVERIFY(!bench.program(Kv720Driver(), settings));
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Module Type: Maximum input range is 500mV"));
+    QCOMPARE(bench.sent.size(), size_t(1));
 }
 
 void TestModuleRun::secondRunRefused() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
+    Kv720Bench bench;
+    QVERIFY(bench.identified);
     ModuleRun other(bench.connection, "MCT00002");
-    QSignalSpy finished(&run, &ModuleRun::finished);
+    const std::size_t from = bench.sim->log().size();
     QString error;
-    QVERIFY(run.startProgramming(Kv720Driver(), milliVolts(), error));
-    QVERIFY(!run.startReading(Kv720Driver(), {}, error));
+    QVERIFY(bench.run.startProgramming(Kv720Driver(), milliVolts(), error));
+    QVERIFY(!bench.run.startReading(Kv720Driver(), {}, error));
     QCOMPARE(error, QString("Please try again !!"));
     QVERIFY(!other.startReading(Kv720Driver(), {}, error));
     QCOMPARE(error, QString("Please try again !!"));
-    QVERIFY(finished.wait(RunWaitMs));
-    QCOMPARE(finished.at(0).at(1).toString(), QString("Programmed"));
+    QVERIFY(bench.finish(from));
+    QCOMPARE(bench.result, QString("Programmed"));
 }
 
 void TestModuleRun::droppedReplyIsRetried() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    SimFaults faults;
-    faults.dropFrame = 40;  // inside the engineering unit writes
-    bench.sim.setFaults(faults);
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome outcome = bench.program(run, milliVolts());
-    QVERIFY2(outcome.ok, qPrintable(outcome.text));
-    const QList<int> dropped = bench.droppedSinceMark();
-    QCOMPARE(dropped.size(), 1);
+    sim::SimFaults faults;
+    faults.dropFrame = 11;  // the write of Eng_Unit2
+    Kv720Bench bench(faults);
+    QVERIFY(bench.identified);
+    QVERIFY2(bench.program(Kv720Driver(), milliVolts()), qPrintable(bench.result));
+    QCOMPARE(bench.dropped.size(), size_t(1));
     // The unanswered frame went out again; apart from that, the order is unchanged.
-    QList<Frame> frames = outcome.frames;
-    QCOMPARE(frames[dropped[0]], frames[dropped[0] + 1]);
-    frames.removeAt(dropped[0]);
-    compareFrames(frames,
-                  expectedFrames(programmingOrder, int(std::size(programmingOrder)), false));
+    std::vector<Frame> frames = bench.sent;
+    const std::size_t at = bench.dropped[0];
+    QCOMPARE(frames[at], frames[at + 1]);
+    frames.erase(frames.begin() + long(at));
+    QString difference;
+    QVERIFY2(drvbench::sameFrames(frames, programmingOrder(false), difference),
+             qPrintable(difference));
+}
+
+void TestModuleRun::deadModuleEndsTheRun_data() {
+    QTest::addColumn<bool>("reading");
+    QTest::addColumn<int>("deadAfter");
+    QTest::newRow("programming") << false << 20;
+    QTest::newRow("reading") << true << 10;
 }
 
 void TestModuleRun::deadModuleEndsTheRun() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    SimFaults faults;
-    faults.deadAfter = 20;
-    bench.sim.setFaults(faults);
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome outcome = bench.program(run, milliVolts());
-    QVERIFY(outcome.ended);
-    QVERIFY(!outcome.ok);
-    QVERIFY2(outcome.text.startsWith("PROGRAM FAIL "), qPrintable(outcome.text));
-    QVERIFY2(outcome.text.contains(": Too many retries:"), qPrintable(outcome.text));
+    QFETCH(bool, reading);
+    QFETCH(int, deadAfter);
+    sim::SimFaults faults;
+    faults.deadAfter = deadAfter;
+    Kv720Bench bench(faults);
+    QVERIFY(bench.identified);
+    QVERIFY(reading ? !bench.read(Kv720Driver(), {}) : !bench.program(Kv720Driver(), milliVolts()));
+    QVERIFY(bench.finished);
+    if (reading) {
+        QVERIFY2(bench.result.endsWith(" - Too many retries: FAIL"), qPrintable(bench.result));
+    } else {
+        QVERIFY2(bench.result.startsWith("PROGRAM FAIL "), qPrintable(bench.result));
+        QVERIFY2(bench.result.contains(": Too many retries:"), qPrintable(bench.result));
+    }
     QVERIFY(!bench.connection.engine().reserved());
     QVERIFY(!bench.connection.engine().connected());
 }
 
-void TestModuleRun::deadModuleEndsARead() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    SimFaults faults;
-    faults.deadAfter = 10;
-    bench.sim.setFaults(faults);
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome outcome = bench.read(run);
-    QVERIFY(outcome.ended);
-    QVERIFY(!outcome.ok);
-    QVERIFY2(outcome.text.endsWith(" - Too many retries: FAIL"), qPrintable(outcome.text));
-}
-
 void TestModuleRun::disconnectEndsTheRun() {
-    Bench bench(kv720());
-    QVERIFY(bench.ok);
-    ModuleRun run(bench.connection, windowTag);
+    Kv720Bench bench;
+    QVERIFY(bench.identified);
     // Closed from outside while a request is waiting: no callback ever comes.
-    connect(&run, &ModuleRun::progress, &run, [&](const QString&, int step) {
+    connect(&bench.run, &ModuleRun::progress, &bench.run, [&](const QString&, int step) {
         if (step == 5) {
             QString error;
             bench.connection.OpenCom(false, error);
         }
     });
-    const Bench::Outcome outcome = bench.program(run, milliVolts());
-    QVERIFY(outcome.ended);
-    QVERIFY(!outcome.ok);
-    QVERIFY2(outcome.text.endsWith(": COM closed"), qPrintable(outcome.text));
+    QVERIFY(!bench.program(Kv720Driver(), milliVolts()));
+    QVERIFY(bench.finished);
+    QVERIFY2(bench.result.endsWith(": COM closed"), qPrintable(bench.result));
     QVERIFY(!bench.connection.engine().reserved());
 }
 
 void TestModuleRun::swappedModuleIsNotProgrammed() {
     // Another KV720 takes over during the table transfer: every later request
     // succeeds on it, yet the run must not report the first one as programmed.
-    Bench bench(kv720(100001));
-    QVERIFY(bench.ok);
-    SimFaults faults;
+    sim::SimFaults faults;
     faults.swapAfter = 80;
-    faults.swapTo = kv720(100002);
-    bench.sim.setFaults(faults);
-    ModuleRun run(bench.connection, windowTag);
-    const Bench::Outcome outcome = bench.program(run, milliVolts());
-    QVERIFY(outcome.ended);
-    QVERIFY(!outcome.ok);
-    QCOMPARE(outcome.text, QString("PROGRAM FAIL Serial number: Module changed"));
+    faults.swapTo = module("KV720-20", 100002);
+    Kv720Bench bench(faults);
+    QVERIFY(bench.identified);
+    QVERIFY(!bench.program(Kv720Driver(), milliVolts()));
+    QVERIFY(bench.finished);
+    QCOMPARE(bench.result, QString("PROGRAM FAIL Serial number: Module changed"));
 }
 
 QTEST_GUILESS_MAIN(TestModuleRun)

@@ -1,17 +1,20 @@
 #pragma once
 // A simulated module on a private COM port, identified by the program, with a
 // settings window's run (ModuleRun) to program and read it one tick at a time,
-// and the frames the module received written out as expected lists.
+// the frames the module received written out as expected lists, and the
+// fields a read must give back.
 
 #include "drivers/module_run.h"
 #include "engine/diagnostics.h"
 #include "engine/module_connection.h"
+#include "model/linearisation.h"
 #include "model/register_map.h"
 #include "sim/simulator.h"
 
 #include <QTemporaryDir>
 #include <QtTest>
 
+#include <initializer_list>
 #include <memory>
 #include <vector>
 
@@ -60,23 +63,37 @@ public:
         data(name);
         return read(name);
     }
+    // Several steps of one kind in a row.
+    Expect& reads(std::initializer_list<const char*> names) {
+        for (const char* name : names)
+            read(name);
+        return *this;
+    }
+    Expect& writes(std::initializer_list<const char*> names) {
+        for (const char* name : names)
+            write(name);
+        return *this;
+    }
     Expect& fileName(bool reading = false) {
         for (int id = 16; id <= 32; id += 4)
             frames_.push_back({reading ? 'R' : 'W', id, at("File_Name")});
         return *this;
     }
     // Table 1 in 51 parts: bus ID 16 + k carries points k and k + 1.
-    Expect& table1(bool reading = false) {
-        for (int id = 16; id <= 116; id += 2)
-            frames_.push_back({reading ? 'R' : 'W', id, at("Table1")});
-        return *this;
-    }
+    Expect& table1(bool reading = false) { return table("Table1", 116, reading); }
+    // Table C in 26 parts, bus IDs 16 to 66.
+    Expect& tableC() { return table("TableC", 66, false); }
     // After the last register the run reads the serial number to make sure the
     // module is still the one it started on.
     Expect& moduleConfirmed() { return read("Serial_No"); }
     const std::vector<Frame>& frames() const { return frames_; }
 
 private:
+    Expect& table(const char* name, int lastId, bool reading) {
+        for (int id = 16; id <= lastId; id += 2)
+            frames_.push_back({reading ? 'R' : 'W', id, at(name)});
+        return *this;
+    }
     int at(const char* name) const {
         const int address = addressOf(name, map_);
         if (address < 0)
@@ -96,11 +113,11 @@ struct Bench {
     bool ok = false;
     QString result;
 
-    explicit Bench(int typeCode, int subType) {
+    Bench(int typeCode, int subType) : Bench(identity(typeCode, subType)) {}
+    explicit Bench(const kv::sim::ModuleIdentity& module) {
         qputenv("KV700_PORT_DIR", portDir.path().toLocal8Bit());
         kv::sim::SimOptions options;
-        options.module.typeCode = typeCode;
-        options.module.subType = subType;
+        options.module = module;
         sim = std::make_unique<kv::sim::Simulator>(options);
         QString error;
         if (!sim->start(error) || !sim->publishAsPort(Port, error))
@@ -129,14 +146,20 @@ struct Bench {
         return tickUntil([this] { return connection.engine().state() == kv::StateRun; });
     }
 
-    // Runs to its end; false when it did not end. The frames it sent are in `sent`.
+    // Runs to its end; false when it did not end. The frames it sent are in
+    // `sent`, the positions among them of those the module left unanswered in `dropped`.
     bool finish(std::size_t from) {
         const bool ended = tickUntil([this] { return finished; });
         const std::vector<kv::sim::SimLogEntry> log = sim->log();
         sent.clear();
-        for (std::size_t i = from; i < log.size(); ++i)
-            if (log[i].kind == kv::sim::SimLogEntry::Request)
-                sent.push_back({log[i].command, log[i].busId, log[i].address});
+        dropped.clear();
+        for (std::size_t i = from; i < log.size(); ++i) {
+            if (log[i].kind != kv::sim::SimLogEntry::Request)
+                continue;
+            if (log[i].outcome == kv::sim::SimLogEntry::Dropped)
+                dropped.push_back(sent.size());
+            sent.push_back({log[i].command, log[i].busId, log[i].address});
+        }
         return ended;
     }
 
@@ -163,7 +186,23 @@ struct Bench {
     }
 
     std::vector<Frame> sent;
+    std::vector<std::size_t> dropped;
+
+private:
+    static kv::sim::ModuleIdentity identity(int typeCode, int subType) {
+        kv::sim::ModuleIdentity module;
+        module.typeCode = typeCode;
+        module.subType = subType;
+        return module;
+    }
 };
+
+// Table 1 as a curve, so that a table read back from elsewhere shows.
+inline void curveTable(kv::SettingsSet& s) {
+    for (int i = 0; i <= kv::Table1LastUsed; ++i)
+        s.Table1[i] = i * i;
+    kv::TableChecksum(s.Table1.data(), kv::Table1LastUsed);
+}
 
 // Compares the frames sent with the expected ones, naming the first difference.
 inline bool sameFrames(const std::vector<Frame>& sent, const std::vector<Frame>& expected,
@@ -176,6 +215,41 @@ inline bool sameFrames(const std::vector<Frame>& sent, const std::vector<Frame>&
             difference = QStringLiteral("frame %1: sent %2, expected %3").arg(i + 1).arg(got, want);
             return false;
         }
+    }
+    return true;
+}
+
+// A field of the settings record, compared as QCOMPARE compares its type.
+struct Field {
+    const char* name;
+    qint32 kv::SettingsSet::*whole = nullptr;
+    float kv::SettingsSet::*single = nullptr;
+    QString kv::SettingsSet::*text = nullptr;
+};
+inline Field field(const char* name, qint32 kv::SettingsSet::*member) {
+    return {name, member, nullptr, nullptr};
+}
+inline Field field(const char* name, float kv::SettingsSet::*member) {
+    return {name, nullptr, member, nullptr};
+}
+inline Field field(const char* name, QString kv::SettingsSet::*member) {
+    return {name, nullptr, nullptr, member};
+}
+#define DRV_FIELD(member) ::drvbench::field(#member, &::kv::SettingsSet::member)
+
+// Compares the named fields of what was read with what was sent; a failure
+// names the first field that differs.
+inline bool sameFields(const kv::SettingsSet& got, const kv::SettingsSet& sent,
+                       std::initializer_list<Field> fields) {
+    for (const Field& f : fields) {
+        const bool same =
+            f.whole
+                ? QTest::qCompare(got.*f.whole, sent.*f.whole, f.name, f.name, __FILE__, __LINE__)
+            : f.single
+                ? QTest::qCompare(got.*f.single, sent.*f.single, f.name, f.name, __FILE__, __LINE__)
+                : QTest::qCompare(got.*f.text, sent.*f.text, f.name, f.name, __FILE__, __LINE__);
+        if (!same)
+            return false;
     }
     return true;
 }
