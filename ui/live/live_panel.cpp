@@ -46,11 +46,20 @@ QLabel* valueLabel(QWidget* parent) {
     font.setBold(true);
     font.setPointSizeF(font.pointSizeF() * ValueScale);
     text->setFont(font);
-    // Room for the widest value a module reports, so the cards keep their width.
+    // Room for the widest value a module reports, so the cards keep their width. A fixed
+    // size also keeps a new reading from re-laying out the whole window several times a second.
     const QFontMetrics metrics(font);
-    text->setMinimumWidth(metrics.horizontalAdvance(QStringLiteral("-0000.00 mAac")));
-    text->setMinimumHeight(metrics.height());
+    text->setFixedSize(metrics.horizontalAdvance(QStringLiteral("-0000.00 mAac")),
+                       metrics.height());
     return text;
+}
+
+// Shows a value; a text wider than the label widens it once instead of being cut.
+void setValue(QLabel* label, const QString& value) {
+    const int needed = label->fontMetrics().horizontalAdvance(value);
+    if (needed > label->width())
+        label->setFixedWidth(needed);
+    label->setText(value);
 }
 
 QLabel* errorLabel(QWidget* parent) {
@@ -288,7 +297,7 @@ void LivePanel::setRemoteRefused(int channel, bool refused) {
 void LivePanel::render() {
     const InputView& in = view_.input;
     input_.labInput->setText(in.heading);
-    input_.labInputValue->setText(in.value);
+    setValue(input_.labInputValue, in.value);
     input_.labCusValInput->setText(shown(in.summary));
     input_.labInputError->setText(in.error);
     input_.labResponce1->setText(in.response);
@@ -314,7 +323,7 @@ void LivePanel::render() {
         OutputWidgets& w = outputs_[channel];
         w.picOutput->setVisible(out.visible);
         w.labOutput->setText(out.heading);
-        w.labOutputValue->setText(out.value);
+        setValue(w.labOutputValue, out.value);
         w.labCusValOutput->setText(shown(out.summary));
         w.labOutputError->setText(out.error);
         for (auto [lamp, state, text] :
