@@ -48,12 +48,11 @@ int main(int argc, char* argv[]) {
                      &kv::hub::ReceiveFile);
     auto* livePanel = new kv::LivePanel(mainWindow.connection());
     mainWindow.setLivePanel(livePanel);
-    QObject::connect(&mainWindow, &kv::hub::colourThemeChanged, livePanel, [livePanel](int theme) {
-        livePanel->SetColour(kv::LiveColours::ForTheme(theme));
-    });
+    QObject::connect(&mainWindow, &kv::hub::colourThemeChanged, livePanel,
+                     [livePanel](int theme) { livePanel->SetColour(kv::PaletteFor(theme)); });
     mainWindow.show();
     mainWindow.Load(file);
-    livePanel->SetColour(kv::LiveColours::ForTheme(kv::ColourTheme()));
+    livePanel->SetColour(kv::PaletteFor(kv::ColourTheme()));
     if (command.demo)
         mainWindow.overrideConnection(kv::DemoPort, kv::DemoConnector,
                                       QStringLiteral("Demo: simulated ") + demo.modelName());

@@ -138,7 +138,7 @@ int main(int argc, char* argv[]) {
     ModuleConnection connection;
     LivePanel panel(connection);
     panel.setWindowTitle(QStringLiteral("Live panel"));
-    panel.SetColour(LiveColours::ForTheme(parser.value(theme).toInt()));
+    panel.SetColour(PaletteFor(parser.value(theme).toInt()));
     panel.ShowModuleControls(ModuleMap);
     for (qint32 address : {RegAdd.Serial_No, RegAdd.Revision, RegAdd.Buss_ID, RegAdd.Int_Temp,
                            RegAdd.Resp1, RegAdd.Input_Reading})

@@ -250,7 +250,7 @@ void LivePanel::ShowModuleControls(int map) {
     render();
 }
 
-void LivePanel::SetColour(const LiveColours& colours) {
+void LivePanel::SetColour(const ColourPalette& colours) {
     colours_ = colours;
     applyStyle();
     render();
@@ -343,10 +343,10 @@ void LivePanel::render() {
 }
 
 void LivePanel::applyStyle() {
-    const QColor cardColour = view_.active ? colours_.background : colours_.panel;
+    const QColor cardColour = view_.active ? colours_.white : colours_.panel;
     const QColor inactiveText(128, 128, 128);
     const QColor textColour = view_.active ? colours_.text : inactiveText;
-    const QColor headingColour = view_.active ? colours_.accent : inactiveText;
+    const QColor headingColour = view_.active ? colours_.themeAccent : inactiveText;
     setStyleSheet(QStringLiteral("QFrame#picContain { background: %1; }"
                                  "QFrame[card=\"true\"] { background: %2; border: 1px solid %3;"
                                  " border-radius: 6px; }"

@@ -5,7 +5,7 @@
 // register records whenever the engine stores a reply, and lays itself out
 // anew whenever the module family changes.
 
-#include "ui/live/live_colours.h"
+#include "ui/common/colour_palette.h"
 #include "ui/live/live_view.h"
 
 #include <QFrame>
@@ -31,7 +31,7 @@ public:
     void KV700Display(qint32 address);
     // Panels for a family (ModuleMap); 0 or an unknown family greys the panel.
     void ShowModuleControls(int map);
-    void SetColour(const LiveColours& colours);
+    void SetColour(const ColourPalette& colours);
 
     const LiveView& view() const { return view_; }
     QLineEdit* txtRemoteSet(int channel) const;
@@ -74,7 +74,7 @@ private:
 
     ModuleConnection& connection_;
     LiveView view_;
-    LiveColours colours_;
+    ColourPalette colours_ = PaletteFor(ThemeWhiteGreen);
     InputWidgets input_;
     std::array<OutputWidgets, 2> outputs_;
     std::array<QLabel*, 4> labValue_{};
