@@ -15,11 +15,12 @@ struct KindPrefix {
     const char* prefix;
 };
 
-// Input types 1..8 (TypInput). The temperature sensors show the measuring unit.
+// By TypInput. The temperature sensors show the measuring unit.
 constexpr KindPrefix prefixes[] = {
-    {1, true, "mv : "},       {2, false, "TC : "},      {3, false, "RTDT 3W : "},
-    {4, false, "RTDT 4W : "}, {5, false, "RTDT 2W : "}, {6, true, "RT 2W : "},
-    {7, true, "POT : "},      {8, true, "WT : "},
+    {Kv720MilliVolt, true, "mv : "},      {Kv720Thermocouple, false, "TC : "},
+    {Kv720Rtd3Wire, false, "RTDT 3W : "}, {Kv720Rtd4Wire, false, "RTDT 4W : "},
+    {Kv720Rtd2Wire, false, "RTDT 2W : "}, {Kv720Resistance, true, "RT 2W : "},
+    {Kv720Potentiometer, true, "POT : "}, {Kv720StrainGauge, true, "WT : "},
 };
 
 }  // namespace
