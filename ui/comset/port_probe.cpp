@@ -2,6 +2,7 @@
 
 #include "model/codec.h"
 #include "model/module_types.h"
+#include "serial/adapter_test.h"
 #include "serial/port_path.h"
 #include "serial/transact.h"
 
@@ -10,7 +11,6 @@
 namespace kv {
 
 namespace {
-const QByteArray moduleTypeRead = QByteArray("R") + char(16) + char(255) + "30303030" + "F";
 const QString accessDenied = QStringLiteral("/Port file error 13");
 constexpr int DataStart = 3;
 constexpr int DataLength = 8;
@@ -34,7 +34,7 @@ QString ProbeDeviceNote(qint16 port, const QString& error) {
     const QFileInfo link(device);
     if (link.isSymLink())
         device = QStringLiteral("%1 -> %2").arg(device, link.symLinkTarget());
-    return error == accessDenied ? device + QStringLiteral(" (no permission)") : device;
+    return ProbeDeniedAccess(error) ? device + QStringLiteral(" (no permission)") : device;
 }
 
 bool ProbeDeniedAccess(const QString& error) {
@@ -58,8 +58,8 @@ std::optional<QString> ProbePort(qint16 port, qint16 connector, QString& error) 
     QByteArray reply;
     bool portFault = false;
     error.clear();
-    const bool replied =
-        KvSerialPort::Transact(port, moduleTypeRead, connector, false, reply, error, portFault);
+    const bool replied = KvSerialPort::Transact(port, KvSerialPort::AdapterTestMessage(), connector,
+                                                false, reply, error, portFault);
     return ProbeEntryText(port, replied, reply, error);
 }
 
