@@ -50,19 +50,17 @@ void hub::openFileIntoTab() {
 }
 
 void hub::readModuleIntoTab() {
-    const SettingsWindowClass* windowClass =
-        IsModuleMap(ModuleMap) ? settingsWindows_.find(ModuleMap) : nullptr;
     if (!IsModuleMap(ModuleMap)) {
         FailGeneral(QStringLiteral("cmdProcess"), HubTag, QStringLiteral("Unknown Module Type"));
-    } else if (!windowClass) {
-        ShowStatus(QStringLiteral("cmdProcess: this version has no settings window for the ") +
-                   DisplayModuleType(RegVal.Mod_Type));
-    } else {
+    } else if (const SettingsWindowClass* windowClass = settingsWindows_.find(ModuleMap)) {
         SettingsWindow* window = windowClass->create(*this);
         addTabWindow(window);
         // The window's reading run keeps the engine and releases it when done.
         window->LoadDialouge(ModuleMap);
         return;
+    } else {
+        ShowStatus(QStringLiteral("cmdProcess: this version has no settings window for the ") +
+                   DisplayModuleType(RegVal.Mod_Type));
     }
     engine().setReserved(false);
 }
