@@ -1,6 +1,5 @@
 // kv700-cli: its command line, and the real program against the module simulator.
 #include "cli/cli_args.h"
-#include "cli/cli_probe.h"
 #include "cli/cli_registers.h"
 #include "model/codec.h"
 #include "model/module_types.h"
@@ -129,8 +128,6 @@ private slots:
     void usageErrors();
     void usageErrorsExitWithTwo();
     void helpGoesToStandardOutput();
-    void probeEntries_data();
-    void probeEntries();
     void setRefusesWhatTheViewerRefuses();
     void valuesDecodedByTheMap();
 
@@ -269,32 +266,6 @@ void TestCli::helpGoesToStandardOutput() {
     QCOMPARE(run.exitCode, 0);
     QCOMPARE(run.out, UsageText());
     QVERIFY(run.err.isEmpty());
-}
-
-void TestCli::probeEntries_data() {
-    QTest::addColumn<bool>("answered");
-    QTest::addColumn<QByteArray>("reply");
-    QTest::addColumn<QString>("error");
-    QTest::addColumn<QString>("entry");
-
-    const QByteArray kv720 = QByteArray("R\x10\xFF") + LongToWire(4) + "0";
-    QTest::newRow("module answers") << true << kv720 << ""
-                                    << "Com7 KV720-20";
-    QTest::newRow("no such port") << false << QByteArray() << "%"
-                                  << "";
-    QTest::newRow("port held") << false << QByteArray() << "/Port is use"
-                               << "Com7/Port is use";
-    QTest::newRow("port refused") << false << QByteArray() << "/Port file error 13"
-                                  << "Com7/Port file error 13";
-    QTest::newRow("silence") << false << QByteArray() << ""
-                             << "Com7";
-}
-
-void TestCli::probeEntries() {
-    QFETCH(bool, answered);
-    QFETCH(QByteArray, reply);
-    QFETCH(QString, error);
-    QTEST(ProbeEntry(7, answered, reply, error), "entry");
 }
 
 void TestCli::setRefusesWhatTheViewerRefuses() {

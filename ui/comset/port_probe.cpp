@@ -1,10 +1,6 @@
 #include "ui/comset/port_probe.h"
 
-#include "model/codec.h"
-#include "model/module_types.h"
-#include "serial/adapter_test.h"
 #include "serial/port_path.h"
-#include "serial/transact.h"
 
 #include <QFileInfo>
 
@@ -12,22 +8,7 @@ namespace kv {
 
 namespace {
 const QString accessDenied = QStringLiteral("/Port file error 13");
-constexpr int DataStart = 3;
-constexpr int DataLength = 8;
 }  // namespace
-
-std::optional<QString> ProbeEntryText(qint16 port, bool replied, const QByteArray& reply,
-                                      const QString& error) {
-    const QString name = QStringLiteral("Com%1").arg(port);
-    if (replied)
-        return name + QLatin1Char(' ') +
-               DisplayModuleType(WireToLong(reply.mid(DataStart, DataLength)));
-    if (error.startsWith(QLatin1Char('%')))
-        return std::nullopt;
-    if (error.startsWith(QLatin1Char('/')))
-        return name + error;
-    return name;
-}
 
 QString ProbeDeviceNote(qint16 port, const QString& error) {
     QString device = KvSerialPort::PortDevicePath(port);
@@ -52,15 +33,6 @@ QString PermissionAdvice(qint16 port) {
     return QStringLiteral("You may not use %1. Add yourself to the group \"%2\" "
                           "(sudo adduser $USER %2), then log out and in again.")
         .arg(device, group);
-}
-
-std::optional<QString> ProbePort(qint16 port, qint16 connector, QString& error) {
-    QByteArray reply;
-    bool portFault = false;
-    error.clear();
-    const bool replied = KvSerialPort::Transact(port, KvSerialPort::AdapterTestMessage(), connector,
-                                                false, reply, error, portFault);
-    return ProbeEntryText(port, replied, reply, error);
 }
 
 }  // namespace kv
