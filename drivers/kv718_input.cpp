@@ -11,7 +11,6 @@ namespace kv {
 
 namespace {
 
-constexpr int KV718Map = 7;
 constexpr double MinimumSpan = 0.2;
 constexpr double SpanTolerance = 1e-9;  // 1.2 - 1.0 is a hair below 0.2 in binary
 constexpr int SamplesPerTenMs = 10;
