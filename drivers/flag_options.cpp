@@ -4,6 +4,13 @@
 
 namespace kv {
 
+const FlagOption SingleOutputOptions[4] = {
+    {&SettingsSet::Inp1Respon, FlagFastResponseBit},
+    {&SettingsSet::UserLmtEna, FlagLimitsBit},
+    {&SettingsSet::DirecrReve, FlagReverseBit},
+    {&SettingsSet::RemoteCont, FlagRemoteBit},
+};
+
 quint16 SetOptionBits(quint16 flags, const SettingsSet& settings, const FlagOption* rows,
                       std::size_t count) {
     for (std::size_t i = 0; i < count; ++i) {

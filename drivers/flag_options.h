@@ -12,11 +12,24 @@ namespace kv {
 
 constexpr int WholeField = -1;  // the flag bit is set when the field is 1
 
+// Flag_A bits of the single-output models: the KV714 second version and the
+// KV718 use all of them; the KV760 shares the three output bits.
+enum OutputFlagBit {
+    FlagShapedBit = 3,        // input shaped by table 1
+    FlagRemoteBit = 4,        // output under remote control
+    FlagReverseBit = 5,       // reverse action
+    FlagLimitsBit = 6,        // signal limits on
+    FlagFastResponseBit = 7,  // fast response
+};
+
 struct FlagOption {
     qint32 SettingsSet::*field;
     int flagBit;
     int fieldBit = WholeField;
 };
+
+// The choices of the KV714 second version and the KV718, one bit each.
+extern const FlagOption SingleOutputOptions[4];
 
 quint16 SetOptionBits(quint16 flags, const SettingsSet& settings, const FlagOption* rows,
                       std::size_t count);

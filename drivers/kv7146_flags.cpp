@@ -7,31 +7,24 @@ namespace kv {
 
 namespace {
 
-const FlagOption kv714Options[] = {
-    {&SettingsSet::Inp1Respon, 7},
-    {&SettingsSet::UserLmtEna, 6},
-    {&SettingsSet::DirecrReve, 5},
-    {&SettingsSet::RemoteCont, 4},
-};
-
 const FlagOption kv716Options[] = {
-    {&SettingsSet::Inp1Respon, 7},    {&SettingsSet::RemoteCont, 0, 0},
-    {&SettingsSet::RemoteCont, 1, 1}, {&SettingsSet::UserLmtEna, 2, 0},
-    {&SettingsSet::UserLmtEna, 3, 1}, {&SettingsSet::DirecrReve, 4, 0},
+    {&SettingsSet::Inp1Respon, FlagFastResponseBit},
+    {&SettingsSet::RemoteCont, 0, 0},
+    {&SettingsSet::RemoteCont, 1, 1},
+    {&SettingsSet::UserLmtEna, 2, 0},
+    {&SettingsSet::UserLmtEna, 3, 1},
+    {&SettingsSet::DirecrReve, 4, 0},
     {&SettingsSet::DirecrReve, 5, 1},
 };
-
-constexpr int KV714TableBit = 3;
-constexpr int KV716TableBit = 6;
 
 }  // namespace
 
 quint16 KV7146v2FlagA(const SettingsSet& settings, int model) {
     const bool kv716 = model == KV716v2;
-    quint16 flags =
-        kv716 ? SetOptionBits(0, settings, kv716Options) : SetOptionBits(0, settings, kv714Options);
+    quint16 flags = kv716 ? SetOptionBits(0, settings, kv716Options)
+                          : SetOptionBits(0, settings, SingleOutputOptions);
     if (settings.Inp1Shape == QLatin1String("Table"))
-        flags = SetBit(flags, kv716 ? KV716TableBit : KV714TableBit);
+        flags = SetBit(flags, kv716 ? KV716v2TableBit : FlagShapedBit);
     return flags;
 }
 
@@ -40,8 +33,8 @@ void KV7146v2ReadFlagA(quint16 flags, int model, SettingsSet& settings) {
     if (kv716)
         ReadOptionBits(flags, kv716Options, settings);
     else
-        ReadOptionBits(flags, kv714Options, settings);
-    settings.Inp1Shape = TestBit(flags, kv716 ? KV716TableBit : KV714TableBit)
+        ReadOptionBits(flags, SingleOutputOptions, settings);
+    settings.Inp1Shape = TestBit(flags, kv716 ? KV716v2TableBit : FlagShapedBit)
                              ? QStringLiteral("Table")
                              : QStringLiteral("Linear");
 }

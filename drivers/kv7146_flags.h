@@ -10,6 +10,9 @@ namespace kv {
 // Model numbers the KV714/KV716 drivers serve; also the family CheckModType confirms.
 enum KV7146Model { KV714v1 = 1, KV716v1 = 2, KV714v2 = 4, KV716v2 = 5 };
 
+// The KV716's table bit; the KV714 keeps its table in FlagShapedBit.
+constexpr int KV716v2TableBit = 6;
+
 quint16 KV7146v2FlagA(const SettingsSet& settings, int model);
 // Response, shape and output choices back from a flag word.
 void KV7146v2ReadFlagA(quint16 flags, int model, SettingsSet& settings);

@@ -11,8 +11,6 @@ namespace kv {
 
 namespace {
 
-constexpr int Kv718Map = 7;
-
 DriverWork work718;
 
 // --- hooks of the programming order ---
@@ -105,7 +103,7 @@ const StepRow readOrder[] = {
 const DriverDescriptor kv718{
     "modKV718vA",
     "GS718vA",
-    Kv718Map,
+    KV718Map,
     "modKV718vA.cbSet",
     "GS718vA.cbGet",
     TableOf(programOrder),

@@ -11,11 +11,8 @@ namespace kv {
 
 namespace {
 
-constexpr int KV718Map = 7;
 constexpr double MinimumSpan = 0.2;
 constexpr double SpanTolerance = 1e-9;  // 1.2 - 1.0 is a hair below 0.2 in binary
-constexpr int ShapeBit = 3;
-constexpr quint16 CouplingMask = 0x3;
 constexpr int SamplesPerTenMs = 10;
 
 // Input couplings in the order of their code in bits 0..1 of the flag word.
@@ -41,13 +38,6 @@ const Coupling* couplingOf(const QString& unit) {
             return &coupling;
     return nullptr;
 }
-
-const FlagOption options[] = {
-    {&SettingsSet::Inp1Respon, 7},
-    {&SettingsSet::UserLmtEna, 6},
-    {&SettingsSet::DirecrReve, 5},
-    {&SettingsSet::RemoteCont, 4},
-};
 
 // A DC row reaches from -max to max; an AC row covers its own span.
 bool holds(const RangeDescriptor& row, const Coupling& coupling, double lo, double hi) {
@@ -115,19 +105,19 @@ bool KV718InputRangeCheck(const QString& minText, const QString& maxText, const 
 }
 
 quint16 KV718FlagA(const SettingsSet& settings) {
-    quint16 flags = SetOptionBits(0, settings, options);
+    quint16 flags = SetOptionBits(0, settings, SingleOutputOptions);
     if (settings.Inp1Shape == QLatin1String("Table"))
-        flags = SetBit(flags, ShapeBit);
+        flags = SetBit(flags, FlagShapedBit);
     if (const Coupling* coupling = couplingOf(settings.Inp1MeUnit))
         flags |= coupling->flagBits;
     return flags;
 }
 
 void KV718ReadFlagA(quint16 flags, SettingsSet& settings) {
-    ReadOptionBits(flags, options, settings);
+    ReadOptionBits(flags, SingleOutputOptions, settings);
     settings.Inp1Shape =
-        TestBit(flags, ShapeBit) ? QStringLiteral("Table") : QStringLiteral("Linear");
-    settings.Inp1MeUnit = QLatin1String(couplings[flags & CouplingMask].unit);
+        TestBit(flags, FlagShapedBit) ? QStringLiteral("Table") : QStringLiteral("Linear");
+    settings.Inp1MeUnit = QLatin1String(couplings[flags & KV718CouplingMask].unit);
 }
 
 bool KV718A_CaculateInCal(const SettingsSet& settings, const RangeTable& input, RegMap& values,

@@ -18,6 +18,13 @@ namespace kv {
 bool KV718InputRangeCheck(const QString& minText, const QString& maxText, const QString& unit,
                           qint32& rangeNumber, QString& message);
 
+// The register map of the KV718-xA.
+constexpr int KV718Map = 7;
+
+// Bits 0..1 of the flag word: the input coupling, 0 DC volts, 1 DC milliamperes,
+// 2 AC volts, 3 AC milliamperes.
+constexpr quint16 KV718CouplingMask = 0x3;
+
 // The flag word of a record: the choices, the shape and the input coupling.
 quint16 KV718FlagA(const SettingsSet& settings);
 // The record fields a flag word gives back: choices, shape and unit.

@@ -5,12 +5,10 @@
 #include "drivers/kv720_read.h"
 #include "drivers/step_runner.h"
 #include "model/codec.h"
+#include "model/entry_number.h"
 #include "model/entry_user_cal.h"
 #include "model/linearisation.h"
 #include "model/range_table.h"
-
-#include <cmath>
-#include <limits>
 
 namespace kv {
 
@@ -27,14 +25,10 @@ quint16 withBit(quint16 flags, int bit, bool on) {
 }
 
 bool toCount(double value, qint32& count, QString& text) {
-    const double rounded = std::nearbyint(value);
-    if (!std::isfinite(rounded) || rounded < std::numeric_limits<qint32>::min() ||
-        rounded > std::numeric_limits<qint32>::max()) {
-        text = QStringLiteral("Invalid Input Cal Values");
-        return false;
-    }
-    count = qint32(rounded);
-    return true;
+    if (RoundToLong(value, count))
+        return true;
+    text = QStringLiteral("Invalid Input Cal Values");
+    return false;
 }
 
 // --- hooks of the programming order ---

@@ -21,8 +21,6 @@ constexpr float HighVoltageDivider = 0.0068f;  // the HI input's attenuation
 constexpr qint32 InductiveSensor = 5;
 constexpr double CountsPerVolt = 9930;
 
-constexpr int FlagLoading = 2;  // bits 0 and 1 hold the trigger band
-
 // Trigger sensitivity bands and the count gain of each. A level up to
 // SensitiveUpTo takes the most sensitive band, one below MiddleBelow the middle one.
 struct TriggerBand {
@@ -42,8 +40,9 @@ constexpr double VoltageZeroV = 0.15;
 constexpr double VoltageSpanV = 14.85;
 
 const FlagOption options[] = {
-    {&SettingsSet::Inp1Respon, 3}, {&SettingsSet::RemoteCont, 4}, {&SettingsSet::DirecrReve, 5},
-    {&SettingsSet::UserLmtEna, 6}, {&SettingsSet::TrigMode, 7},
+    {&SettingsSet::Inp1Respon, KV760FilterBit}, {&SettingsSet::RemoteCont, FlagRemoteBit},
+    {&SettingsSet::DirecrReve, FlagReverseBit}, {&SettingsSet::UserLmtEna, FlagLimitsBit},
+    {&SettingsSet::TrigMode, KV760TrigModeBit},
 };
 
 // Sensor types whose input has its load switched in (bit 2 of the flag word).
@@ -125,7 +124,7 @@ bool KV760StartValues(const SettingsSet& settings, const RegMap& factory, KV760I
     const TriggerBand& band = bandOf(level);
     quint16 flags = band.bits;
     if (loaded(settings.Inp1RngTyp, settings.Typ1InRes))
-        flags = SetBit(flags, FlagLoading);
+        flags = SetBit(flags, KV760LoadingBit);
     flags = SetOptionBits(flags, settings, options);
 
     KV760Input result;
@@ -160,7 +159,7 @@ void KV760ReadInput(const RegMap& values, SettingsSet& settings, QString& warnin
 
     ReadOptionBits(flags, options, settings);
     settings.Typ1InRes =
-        settings.Inp1RngTyp == InductiveSensor && TestBit(flags, FlagLoading) ? 1 : 0;
+        settings.Inp1RngTyp == InductiveSensor && TestBit(flags, KV760LoadingBit) ? 1 : 0;
     const double level = values.Trig_Level / (CountsPerVolt * bandOfFlags(flags).gain) /
                          dividerOf(settings.Inp1RngTyp);
     settings.TrigLevel = float(std::nearbyint(level * 100) / 100);

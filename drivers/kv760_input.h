@@ -13,6 +13,14 @@ namespace kv {
 constexpr qint32 KV760FirstSensor = 1;
 constexpr qint32 KV760LastSensor = 7;
 
+// Flag_A bits of the KV760 besides the output bits of drivers/flag_options.h;
+// bits 0 and 1 hold the trigger band.
+enum KV760FlagBit {
+    KV760LoadingBit = 2,   // the input's load is switched in
+    KV760FilterBit = 3,    // input filter on
+    KV760TrigModeBit = 7,  // trigger mode
+};
+
 struct KV760Input {
     qint16 typeInUnit = 0;  // sensor type in bits 4..6, kHz bit 7, table bit 0
     qint16 flagA = 0;

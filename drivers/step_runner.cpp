@@ -23,7 +23,7 @@ struct TableData {
     const qint32* read;     // the parts received into RegVal
 };
 
-bool tableOf(const RegisterRef& reg, const SettingsSet& settings, TableData& table) {
+bool tableOf(const RegisterRef& reg, const SettingsSet& settings, TableData& table, QString& text) {
     if (reg.isSameAs(KV_REG(Table1))) {
         table = {Table1LastUsed, settings.Table1.data(), RegVal.Table1_Pts.data()};
         return true;
@@ -32,6 +32,7 @@ bool tableOf(const RegisterRef& reg, const SettingsSet& settings, TableData& tab
         table = {TableCLastUsed, settings.TableC.data(), RegVal.TableC_Pts.data()};
         return true;
     }
+    text = QStringLiteral("? table ") + QLatin1String(reg.name());
     return false;
 }
 
@@ -92,10 +93,8 @@ bool sendTablePart(StepContext& step, const RegisterRef& reg, QString& text) {
     if (step.reading)
         return readPart(step, reg, text);
     TableData table{};
-    if (!tableOf(reg, step.settings, table)) {
-        text = QStringLiteral("? table ") + QLatin1String(reg.name());
+    if (!tableOf(reg, step.settings, table, text))
         return false;
-    }
     const int index = TableStepIndex(step.work.DrvBusID, table.lastUsed);
     const QVector<TableStep> parts = TableTransferSteps(table.written, table.lastUsed);
     return step.engine.W_DataOK(reg.address(RegAdd), step.work.DrvBusID, step.work.DrvRequester,
@@ -161,10 +160,8 @@ bool fileNamePart(StepContext& step, const RegisterRef& reg, bool& done, QString
 // table read back with a wrong checksum is reported in the warning text.
 bool tablePart(StepContext& step, const RegisterRef& reg, bool& done, QString& text) {
     TableData table{};
-    if (!tableOf(reg, step.settings, table)) {
-        text = QStringLiteral("? table ") + QLatin1String(reg.name());
+    if (!tableOf(reg, step.settings, table, text))
         return false;
-    }
     if (!CheckTableReturnId(step.work.DrvBusID, step.busId, !step.reading, text)) {
         if (!step.reading)
             DebugMessage(DiagGeneral, QStringLiteral("WriteTable"), text);

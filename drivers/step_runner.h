@@ -28,7 +28,7 @@ bool ReadStep(const DriverDescriptor& driver, RequestEngine& engine, qint32 id, 
               QString& text, SettingsSet& settings);
 
 // Pauses the queue for `seconds`, showing "Delay " and the text on the status
-// line. Pending events other than user input are processed meanwhile.
+// line. No events are processed meanwhile.
 void AddDelay(double seconds, const QString& text);
 
 }  // namespace kv
