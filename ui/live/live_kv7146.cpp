@@ -1,3 +1,5 @@
+#include "drivers/flag_options.h"
+#include "drivers/kv7146_flags.h"
 #include "model/entry_user_cal.h"
 #include "model/register_values.h"
 #include "ui/live/live_common.h"
@@ -114,7 +116,8 @@ std::optional<float> KV714KV716_Input_and_A(LiveView& view, const LiveSource& so
     const RegMap& val = source.val;
     InputView& input = view.input;
     if (hasFlagA(source))
-        input.response = Bit(val.Flag_A, 7) ? QStringLiteral("Fast") : QStringLiteral("Slow");
+        input.response =
+            Bit(val.Flag_A, FlagFastResponseBit) ? QStringLiteral("Fast") : QStringLiteral("Slow");
     const bool software = val.Sw_In1 == SoftwareSwitch && softwareOutput(val.Sw_Out1);
     const qint32 rowNumber = software ? val.In_Rng1 : val.Sw_In1;
     if (!InRange(rowNumber, 0, RangeEntries - 1)) {
@@ -144,7 +147,7 @@ std::optional<float> KV714KV716_Input_and_A(LiveView& view, const LiveSource& so
         full = val.Eng_In_F;
         fraction = float(val.Input_Reading) / 10000.0f;
     }
-    const int shapingBit = source.map == Kv714v2Map ? 3 : 6;
+    const int shapingBit = source.map == Kv714v2Map ? int(FlagShapedBit) : KV716v2TableBit;
     const bool shaped = hasFlagA(source) && Bit(val.Flag_A, shapingBit);
     if (!software)
         input.summary = CrLf + position + QStringLiteral(" = ") + row.description;

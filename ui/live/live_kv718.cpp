@@ -1,3 +1,5 @@
+#include "drivers/flag_options.h"
+#include "drivers/kv718_input.h"
 #include "model/register_values.h"
 #include "ui/live/live_common.h"
 #include "ui/live/live_display.h"
@@ -39,8 +41,9 @@ void KV718vA_Display(LiveView& view, const LiveSource& source) {
         view.input.value = Unknown;
         return;
     }
-    view.input.response = Bit(val.Flag_A, 7) ? QStringLiteral("Fast") : QStringLiteral("Slow");
-    const Coupling& coupling = couplings[val.Flag_A & 3];
+    view.input.response =
+        Bit(val.Flag_A, FlagFastResponseBit) ? QStringLiteral("Fast") : QStringLiteral("Slow");
+    const Coupling& coupling = couplings[val.Flag_A & KV718CouplingMask];
     const QString units = EngUnitText(val);
     view.input.summary = QLatin1String(coupling.prefix) +
                          Fixed(source.input1[val.In_Rng1].maximum * coupling.factor, "0.00") +
@@ -48,10 +51,10 @@ void KV718vA_Display(LiveView& view, const LiveSource& source) {
                          Fixed(val.Eng_In_Z, "0.000") + QStringLiteral(" ... ") +
                          Fixed(val.Eng_In_F, "0.000") + QLatin1Char(' ') + units +
                          QLatin1Char(' ') +
-                         (Bit(val.Flag_A, 3) ? QStringLiteral("Shaped") : QString());
+                         (Bit(val.Flag_A, FlagShapedBit) ? QStringLiteral("Shaped") : QString());
     ShowInputValue(view.input, EngineeringInput(val), units);
-    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, 6), Bit(val.Flag_A, 5),
-                Bit(val.Flag_A, 4));
+    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, FlagLimitsBit),
+                Bit(val.Flag_A, FlagReverseBit), Bit(val.Flag_A, FlagRemoteBit));
 }
 
 }  // namespace kv

@@ -1,3 +1,5 @@
+#include "drivers/flag_options.h"
+#include "drivers/kv760_input.h"
 #include "model/entry_number.h"
 #include "model/register_values.h"
 #include "ui/live/live_common.h"
@@ -63,9 +65,9 @@ void KV760v1Display(LiveView& view, const LiveSource& source) {
                QStringLiteral(" T:") + pulse(val.Trig_Level_RT);
     view.input.summary = summary;
     view.input.response =
-        Bit(val.Flag_A, 3) ? QStringLiteral("Filt ON") : QStringLiteral("Filt OFF");
-    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, 6), Bit(val.Flag_A, 5),
-                Bit(val.Flag_A, 4));
+        Bit(val.Flag_A, KV760FilterBit) ? QStringLiteral("Filt ON") : QStringLiteral("Filt OFF");
+    Output_KVv2(view, source, val.Out_Rng1, 0, Bit(val.Flag_A, FlagLimitsBit),
+                Bit(val.Flag_A, FlagReverseBit), Bit(val.Flag_A, FlagRemoteBit));
 }
 
 }  // namespace kv
