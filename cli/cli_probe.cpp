@@ -1,23 +1,13 @@
 #include "cli/cli_probe.h"
 
+#include "cli/cli_args.h"
 #include "model/codec.h"
 #include "model/module_types.h"
 #include "model/register_map.h"
+#include "serial/frame.h"
 #include "serial/transact.h"
 
 namespace kv::cli {
-
-namespace {
-constexpr char ProbeBusId = 16;
-
-QByteArray moduleTypeRead() {
-    QByteArray message("R");
-    message += ProbeBusId;
-    message += char(RegMapFor(NoModuleMap).Mod_Type);
-    message += "30303030F";
-    return message;
-}
-}  // namespace
 
 QString ProbeEntry(qint16 port, bool answered, const QByteArray& reply, const QString& error) {
     const QString name = QStringLiteral("Com%1").arg(port);
@@ -31,7 +21,8 @@ QString ProbeEntry(qint16 port, bool answered, const QByteArray& reply, const QS
 }
 
 QString ProbePorts(qint16 connector) {
-    const QByteArray message = moduleTypeRead();
+    const QByteArray message =
+        KvSerialPort::ReadMessage(DefaultBusId, RegMapFor(NoModuleMap).Mod_Type);
     QString list;
     for (qint16 port = FirstProbedPort; port <= LastProbedPort; ++port) {
         QByteArray reply;
