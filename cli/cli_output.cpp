@@ -1,7 +1,5 @@
 #include "cli/cli_output.h"
 
-#include "model/codec.h"
-
 #include <cstdio>
 #include <unistd.h>
 
@@ -61,9 +59,7 @@ void StderrSink::writeLine(const QString& text) {
 
 void StderrSink::debugMessage(int level, const QString& tag, const QString& text,
                               const QByteArray& data, const QString& kind) {
-    // The message log's own line form.
-    const QString separator = level == DiagSerialStep ? QString() : QStringLiteral(":");
-    verboseLine(tag + separator + kind + text + StrToHex(data));
+    verboseLine(LogLine(level, tag, text, data, kind));
 }
 
 void StderrSink::addMessage(const QString& text) {

@@ -35,6 +35,12 @@ void DebugMessage(int level, const QString& tag, const QString& text, const QByt
         ShowStatus(tag + QLatin1Char(':') + text + StrToHex(data));
 }
 
+QString LogLine(int level, const QString& tag, const QString& text, const QByteArray& data,
+                const QString& kind) {
+    const QString separator = level == DiagSerialStep ? QString() : QStringLiteral(":");
+    return tag + separator + kind + text + StrToHex(data);
+}
+
 void AddMessage(const QString& text) {
     qCDebug(lcEngine).noquote() << text;
     if (installedSink)

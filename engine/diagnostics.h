@@ -36,6 +36,9 @@ DiagnosticSink* SetDiagnosticSink(DiagnosticSink* sink);
 void DebugMessage(int level, const QString& tag, const QString& text, const QByteArray& data = {},
                   const QString& kind = {});
 void AddMessage(const QString& text);
+// The message log's form of a diagnostic line, without its line break.
+QString LogLine(int level, const QString& tag, const QString& text, const QByteArray& data,
+                const QString& kind);
 void ShowStatus(const QString& text);
 // The text last put on the status line.
 QString StatusText();

@@ -1,7 +1,5 @@
 #include "engine/message_log.h"
 
-#include "model/codec.h"
-
 namespace kv {
 
 MessageLog::MessageLog(QObject* parent) : QObject(parent) {
@@ -43,10 +41,8 @@ void MessageLog::resetStatusCounter() {
 
 void MessageLog::debugMessage(int level, const QString& tag, const QString& text,
                               const QByteArray& data, const QString& kind) {
-    if (DebugFlag() && level >= DiagSend && level <= DiagSerialStep && options_[level]) {
-        const QString separator = level == DiagSerialStep ? QString() : QStringLiteral(":");
-        append(tag + separator + kind + text + StrToHex(data) + QLatin1Char('\n'));
-    }
+    if (DebugFlag() && level >= DiagSend && level <= DiagSerialStep && options_[level])
+        append(LogLine(level, tag, text, data, kind) + QLatin1Char('\n'));
 }
 
 void MessageLog::addMessage(const QString& text) {

@@ -22,7 +22,6 @@ namespace {
 constexpr qint32 LowestAddress = 16;
 constexpr qint16 LowestBusId = 16;
 constexpr int ReserveWaitMs = 5000;
-const QByteArray readFiller = "30303030";
 
 QString timeOfDay(const char* suffix) {
     const double seconds = QTime::currentTime().msecsSinceStartOfDay() / 1000.0;
@@ -58,15 +57,6 @@ QByteArray dataField(const QVariant& v1, const QVariant& v2, const QVariant& v3,
     default:
         return "00000000";
     }
-}
-
-QByteArray message(char command, qint16 busId, qint32 address, const QByteArray& data) {
-    QByteArray m(1, command);
-    m += char(busId);
-    m += char(address);
-    m += data;
-    m += 'F';
-    return m;
 }
 }  // namespace
 
@@ -137,8 +127,13 @@ void RequestEngine::refuse(const QString& procedure, const QString& why, QString
     DebugMessage(DiagGeneral, procedure, why);
 }
 
-QByteArray RequestEngine::readMessage(qint32 address, qint16 busId) const {
-    return message('R', busId, address, readFiller);
+void RequestEngine::take(qint32 address, qint16 busId, const QString& tag, qint32 kind,
+                         qint32 state) {
+    awaitedAddress_ = address;
+    busId_ = busId;
+    callerTag_ = tag;
+    callbackKind_ = kind;
+    state_ = state;
 }
 
 bool RequestEngine::R_CB(qint32 address, qint16 busId, const QString& tag, qint32 kind,
@@ -150,12 +145,8 @@ bool RequestEngine::R_CB(qint32 address, qint16 busId, const QString& tag, qint3
         refuse(QStringLiteral("R_CB"), why, error);
         return false;
     }
-    currentMessage_ = readMessage(address, busId);
-    awaitedAddress_ = address;
-    busId_ = busId;
-    callerTag_ = tag;
-    callbackKind_ = kind;
-    state_ = StateCallBackVal;
+    currentMessage_ = KvSerialPort::ReadMessage(busId, address);
+    take(address, busId, tag, kind, StateCallBackVal);
     return true;
 }
 
@@ -165,12 +156,8 @@ bool RequestEngine::PollRead(qint32 address, QString& error) {
         refuse(QStringLiteral("R_CB"), why, error);
         return false;
     }
-    currentMessage_ = readMessage(address, LowestBusId);
-    awaitedAddress_ = address;
-    busId_ = LowestBusId;
-    callerTag_ = QStringLiteral("hub");
-    callbackKind_ = CallbackHub;
-    state_ = StatePollRead;
+    currentMessage_ = KvSerialPort::ReadMessage(LowestBusId, address);
+    take(address, LowestBusId, QStringLiteral("hub"), CallbackHub, StatePollRead);
     return true;
 }
 
@@ -187,12 +174,9 @@ bool RequestEngine::W_DataOK(qint32 address, qint16 busId, const QString& tag, c
         return false;
     }
     const char letter = command == QLatin1String("T") ? 'T' : 'W';
-    currentMessage_ = message(letter, busId, address, dataField(v1, v2, v3, v4, valueType));
-    awaitedAddress_ = address;
-    busId_ = busId;
-    callerTag_ = tag;
-    callbackKind_ = CallbackSet;
-    state_ = StateWriteData;
+    currentMessage_ =
+        KvSerialPort::BuildMessage(letter, busId, address, dataField(v1, v2, v3, v4, valueType));
+    take(address, busId, tag, CallbackSet, StateWriteData);
     return true;
 }
 
@@ -207,13 +191,9 @@ bool RequestEngine::W_DelayCB(qint32 address, const QVariant& value, qint16 valu
         valueType == ValueLong || valueType == ValueSingle || valueType == ValueLongToo;
     const QByteArray data =
         typed ? dataField(value, {}, {}, {}, valueType) : QByteArray("00000000");
-    delayedWrite_ = message('W', LowestBusId, address, data);
-    delayedRead_ = readMessage(address, LowestBusId);
-    awaitedAddress_ = address;
-    busId_ = LowestBusId;
-    callerTag_ = tag;
-    callbackKind_ = kind;
-    state_ = StateDelayCB;
+    delayedWrite_ = KvSerialPort::BuildMessage('W', LowestBusId, address, data);
+    delayedRead_ = KvSerialPort::ReadMessage(LowestBusId, address);
+    take(address, LowestBusId, tag, kind, StateDelayCB);
     return true;
 }
 

@@ -121,7 +121,8 @@ private:
     bool exchange(const QString& failText);
     void afterFailedAttempt();
     void giveUp();
-    QByteArray readMessage(qint32 address, qint16 busId) const;
+    // Makes the request the current one: who waits for which address, and how.
+    void take(qint32 address, qint16 busId, const QString& tag, qint32 kind, qint32 state);
 
     CallbackReceiver* hub_ = nullptr;
     std::vector<std::pair<QString, CallbackReceiver*>> receivers_;

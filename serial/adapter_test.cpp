@@ -1,14 +1,17 @@
 #include "serial/adapter_test.h"
 
 #include "engine/diagnostics.h"
+#include "model/register_map.h"
 #include "serial/frame.h"
 #include "serial/port_handle.h"
+#include "serial/transact.h"
 
 #include <QElapsedTimer>
 
 namespace kv::KvSerialPort {
 
 namespace {
+constexpr qint16 TestBusId = 16;
 constexpr int PrimingBlocks = 10;
 constexpr int MaxReads = 51;
 constexpr int AccumulatorLimit = 800;
@@ -21,41 +24,22 @@ QString millis(qint64 ms, const char* pattern) {
 
 // Runs the exchange on an open port; returns the outcome text without its prefix.
 bool judgeAdapter(PortHandle& handle, const QByteArray& frame, QString& text) {
-    const QByteArray priming(FrameLength, 'd');
-    int written = 0;
-    int sysError = 0;
-    for (int block = 0; block < PrimingBlocks; ++block) {
-        if (!handle.writeBlock(priming.constData(), FrameLength, written, sysError)) {
-            text = QStringLiteral("Prime fail:%1").arg(sysError);
-            return false;
-        }
-        if (written != FrameLength) {
-            text = QStringLiteral("Prime Len Fail:%1").arg(written);
-            return false;
-        }
-    }
+    if (!SendPriming(handle, PrimingBlocks, text))
+        return false;
     DebugMessage(DiagSerialStep, QStringLiteral("COM"), QStringLiteral("0 >>>"), frame,
                  QStringLiteral("St"));
     QElapsedTimer clock;
     clock.start();
-    if (!handle.writeBlock(frame.constData(), FrameLength, written, sysError)) {
-        text = QStringLiteral("WriteFile failed:%1").arg(sysError);
+    if (!SendFrame(handle, frame, text))
         return false;
-    }
-    if (written != FrameLength) {
-        text = QStringLiteral("Send Lenght Failed:%1").arg(written);
-        return false;
-    }
 
     QByteArray received;
     received.reserve(AccumulatorLimit);
     char buffer[FrameLength + 1];
     for (int read = 1; read <= MaxReads; ++read) {
         int count = 0;
-        if (!handle.readBlock(buffer, FrameLength, count, sysError)) {
-            text = QStringLiteral("ReadFile failed: %1").arg(sysError);
+        if (!ReceiveBlock(handle, buffer, count, text))
             return false;
-        }
         received.append(buffer, qMin<qsizetype>(count, AccumulatorLimit - received.size()));
         const qint64 elapsed = clock.elapsed();
         DebugMessage(DiagSerialStep, QStringLiteral("COM"), millis(elapsed, " +"), received,
@@ -84,11 +68,7 @@ bool judgeAdapter(PortHandle& handle, const QByteArray& frame, QString& text) {
 }  // namespace
 
 QByteArray AdapterTestMessage() {
-    QByteArray message("R");
-    message += char(16);
-    message += char(255);
-    message += "30303030F";
-    return message;
+    return ReadMessage(TestBusId, RegMapFor(NoModuleMap).Mod_Type);
 }
 
 AdapterTestOutcome TestAdapter(qint16 port, const QByteArray& message) {

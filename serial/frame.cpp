@@ -5,6 +5,19 @@
 
 namespace kv::KvSerialPort {
 
+QByteArray BuildMessage(char command, qint16 busId, qint32 address, const QByteArray& data) {
+    QByteArray message(1, command);
+    message += char(busId);
+    message += char(address);
+    message += data;
+    message += 'F';
+    return message;
+}
+
+QByteArray ReadMessage(qint16 busId, qint32 address) {
+    return BuildMessage('R', busId, address, "30303030");
+}
+
 QByteArray BuildFrame(const QByteArray& message) {
     QByteArray frame;
     frame.reserve(FrameLength);

@@ -14,6 +14,12 @@ constexpr char ETX = 0x03;
 constexpr int MessageLength = 12;
 constexpr int FrameLength = 16;
 
+// The 12-character message: command, bus ID, address, the 8-character data
+// field and the request status "F".
+QByteArray BuildMessage(char command, qint16 busId, qint32 address, const QByteArray& data);
+// A read request; its data field is the filler "30303030".
+QByteArray ReadMessage(qint16 busId, qint32 address);
+
 // The 16-byte frame of a 12-character message, sent as given.
 QByteArray BuildFrame(const QByteArray& message);
 

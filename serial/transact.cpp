@@ -22,7 +22,46 @@ void logStep(const QString& text, const QByteArray& data) {
 }
 
 const QByteArray primingBlock(FrameLength, 'd');
+constexpr int PrimingBlocksPerRead = 2;
 }  // namespace
+
+bool SendFrame(PortHandle& handle, const QByteArray& frame, QString& error) {
+    int written = 0;
+    int sysError = 0;
+    if (!handle.writeBlock(frame.constData(), FrameLength, written, sysError)) {
+        error = QStringLiteral("WriteFile failed:%1").arg(sysError);
+        return false;
+    }
+    if (written != FrameLength) {
+        error = QStringLiteral("Send Lenght Failed:%1").arg(written);
+        return false;
+    }
+    return true;
+}
+
+bool SendPriming(PortHandle& handle, int blocks, QString& error) {
+    int written = 0;
+    int sysError = 0;
+    for (int block = 0; block < blocks; ++block) {
+        if (!handle.writeBlock(primingBlock.constData(), FrameLength, written, sysError)) {
+            error = QStringLiteral("Prime fail:%1").arg(sysError);
+            return false;
+        }
+        if (written != FrameLength) {
+            error = QStringLiteral("Prime Len Fail:%1").arg(written);
+            return false;
+        }
+    }
+    return true;
+}
+
+bool ReceiveBlock(PortHandle& handle, char* buffer, int& count, QString& error) {
+    int sysError = 0;
+    if (handle.readBlock(buffer, FrameLength, count, sysError))
+        return true;
+    error = QStringLiteral("ReadFile failed: %1").arg(sysError);
+    return false;
+}
 
 bool Transact(qint16 port, const QByteArray& message, qint16 connector, bool debug,
               QByteArray& reply, QString& error, bool& portFault) {
@@ -58,38 +97,18 @@ bool Transact(qint16 port, const QByteArray& message, qint16 connector, bool deb
     clock.start();
     DebugMessage(DiagSerialStep, comTag, QStringLiteral("0 >>>"), frame, QStringLiteral("St"));
 
-    int written = 0;
-    int sysError = 0;
-    if (!handle.writeBlock(frame.constData(), FrameLength, written, sysError)) {
-        error = QStringLiteral("WriteFile failed:%1").arg(sysError);
+    if (!SendFrame(handle, frame, error))
         return false;
-    }
-    if (written != FrameLength) {
-        error = QStringLiteral("Send Lenght Failed:%1").arg(written);
-        return false;
-    }
 
     QByteArray accumulator;
     accumulator.reserve(2 * FrameLength);
     char buffer[FrameLength + 1];
     for (int cycle = 1; cycle <= budget; ++cycle) {
-        if (connector == ConnectorPrimed) {
-            for (int block = 0; block < 2; ++block) {
-                if (!handle.writeBlock(primingBlock.constData(), FrameLength, written, sysError)) {
-                    error = QStringLiteral("Prime fail:%1").arg(sysError);
-                    return false;
-                }
-                if (written != FrameLength) {
-                    error = QStringLiteral("Prime Len Fail:%1").arg(written);
-                    return false;
-                }
-            }
-        }
-        int count = 0;
-        if (!handle.readBlock(buffer, FrameLength, count, sysError)) {
-            error = QStringLiteral("ReadFile failed: %1").arg(sysError);
+        if (connector == ConnectorPrimed && !SendPriming(handle, PrimingBlocksPerRead, error))
             return false;
-        }
+        int count = 0;
+        if (!ReceiveBlock(handle, buffer, count, error))
+            return false;
         accumulator.append(buffer, count);
         if (debug)
             logStep(elapsedText(clock, " +"), accumulator);

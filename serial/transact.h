@@ -7,6 +7,8 @@
 
 namespace kv::KvSerialPort {
 
+class PortHandle;
+
 // Adapter types of the connection settings; the second needs priming blocks.
 enum Connector : qint16 { ConnectorPlain = 0, ConnectorPrimed = 1 };
 
@@ -21,5 +23,13 @@ constexpr int TableReadBudget = 50;  // read cycles for a table step "T"
 // not be opened or the command is unknown: the caller closes the connection.
 bool Transact(qint16 port, const QByteArray& message, qint16 connector, bool debug,
               QByteArray& reply, QString& error, bool& portFault);
+
+// Writes the 16-byte frame; the texts of a failed or short write are the
+// exchange's own, shared with the adapter self-test.
+bool SendFrame(PortHandle& handle, const QByteArray& frame, QString& error);
+// Writes `blocks` priming blocks, which the primed adapter needs to pass data on.
+bool SendPriming(PortHandle& handle, int blocks, QString& error);
+// Reads up to one frame's length into `buffer`; `count` may be 0.
+bool ReceiveBlock(PortHandle& handle, char* buffer, int& count, QString& error);
 
 }  // namespace kv::KvSerialPort
