@@ -3,12 +3,18 @@
 // the output choices. The KV716 keeps a choice per output (bit 0 of the record
 // field for output 1, bit 1 for output 2); the KV714 one choice each.
 
+#include "model/register_map.h"
 #include "model/settings_set.h"
 
 namespace kv {
 
 // Model numbers the KV714/KV716 drivers serve; also the family CheckModType confirms.
-enum KV7146Model { KV714v1 = 1, KV716v1 = 2, KV714v2 = 4, KV716v2 = 5 };
+enum KV7146Model {
+    KV714v1 = Kv714v1Map,
+    KV716v1 = Kv716v1Map,
+    KV714v2 = Kv714v2Map,
+    KV716v2 = Kv716v2Map,
+};
 
 // The KV716's table bit; the KV714 keeps its table in FlagShapedBit.
 constexpr int KV716v2TableBit = 6;

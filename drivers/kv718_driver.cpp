@@ -103,7 +103,7 @@ const StepRow readOrder[] = {
 const DriverDescriptor kv718{
     "modKV718vA",
     "GS718vA",
-    KV718Map,
+    Kv718AMap,
     "modKV718vA.cbSet",
     "GS718vA.cbGet",
     TableOf(programOrder),

@@ -80,7 +80,7 @@ bool KV718InputRangeCheck(const QString& minText, const QString& maxText, const 
         return false;
     }
     RangeTable table;
-    if (!GetRangeTable(KV718Map, Input1, table)) {
+    if (!GetRangeTable(Kv718AMap, Input1, table)) {
         message = QStringLiteral("Failed to get range details");
         return false;
     }

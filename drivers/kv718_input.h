@@ -19,7 +19,6 @@ bool KV718InputRangeCheck(const QString& minText, const QString& maxText, const 
                           qint32& rangeNumber, QString& message);
 
 // The register map of the KV718-xA.
-constexpr int KV718Map = 7;
 
 // Bits 0..1 of the flag word: the input coupling, 0 DC volts, 1 DC milliamperes,
 // 2 AC volts, 3 AC milliamperes.

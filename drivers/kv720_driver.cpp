@@ -14,7 +14,6 @@ namespace kv {
 
 namespace {
 
-constexpr int Kv720Map = 3;
 constexpr double PauseSeconds = 0.1;
 constexpr int LastRange = RangeEntries - 1;
 

@@ -11,7 +11,6 @@ namespace kv {
 
 namespace {
 
-constexpr int Kv760Map = 6;
 // Flag_C bit 7 is set while the module is being programmed.
 constexpr int ProgrammingBit = 7;
 // DrvBusID tells the two writes of Flag_C apart: the first is queued with 32.

@@ -11,9 +11,6 @@ namespace kv {
 namespace {
 const QString hubTag = QStringLiteral("hub");
 constexpr qint32 LowestDefined = 16;  // addresses up to this are "not defined" for polling
-constexpr int Kv720Map = 3;           // reads no calibration values
-constexpr int Kv716Map = 2;
-constexpr int Kv716v2Map = 5;
 
 bool defined(double address) {
     return address > LowestDefined;
@@ -217,7 +214,7 @@ void ModuleConnection::onCalibrationValue(qint32 address) {
         table[info.range].*end = count;
         // The loop-powered 4-20 mA input shares the counts of the plain one.
         if (info.channel == Input1 && info.range == 3 &&
-            (ModuleMap == Kv716Map || ModuleMap == Kv716v2Map))
+            (ModuleMap == Kv716v1Map || ModuleMap == Kv716v2Map))
             table[4].*end = count;
     }
     if (address < RegAdd.Rng_Last) {

@@ -117,7 +117,18 @@ private:
 };
 
 constexpr int MapCount = 7;  // register maps 1..7
-enum ModuleMapNumber { NoModuleMap = 0, UnknownModuleMap = 99 };
+// Register maps: one per module family.
+enum ModuleMapNumber {
+    NoModuleMap = 0,
+    Kv714v1Map = 1,
+    Kv716v1Map = 2,
+    Kv720Map = 3,
+    Kv714v2Map = 4,  // also the KV718 "-10"/"-20"
+    Kv716v2Map = 5,
+    Kv760Map = 6,
+    Kv718AMap = 7,
+    UnknownModuleMap = 99,
+};
 
 enum class RegWidth : quint8 { Long, Int, Single };
 

@@ -40,8 +40,6 @@ Run runCli(const QStringList& arguments, const QProcessEnvironment& environment 
     return run;
 }
 
-constexpr int Kv720Map = 3;
-
 // One simulated module published as a COM port of its own for one test.
 class SimPort {
 public:

@@ -44,7 +44,6 @@ SettingsSet record(const QString& unit, qint32 range, float lo, float hi) {
 }
 
 constexpr int Kv718Type = 10;
-constexpr int Kv718Map = 7;
 
 // A record as the KV718-xA window hands it over, its input range chosen by the check.
 SettingsSet kv718Record(const QString& unit, float lo, float hi) {
@@ -76,7 +75,7 @@ SettingsSet kv718Record(const QString& unit, float lo, float hi) {
 }
 
 std::vector<drvbench::Frame> kv718Programming() {
-    drvbench::Expect e(Kv718Map);
+    drvbench::Expect e(Kv718AMap);
     e.read("Mod_Type")
         .fileName()
         .writes({"Eng_Unit1", "Eng_Unit2", "Eng_Unit3", "Eng_Unit4", "Eng_In_Z", "Eng_In_F",
@@ -91,7 +90,7 @@ std::vector<drvbench::Frame> kv718Programming() {
 }
 
 std::vector<drvbench::Frame> kv718Reading() {
-    drvbench::Expect e(Kv718Map);
+    drvbench::Expect e(Kv718AMap);
     e.read("Mod_Type")
         .read("Buss_ID")
         .fileName(true)
@@ -325,7 +324,7 @@ void TestDrv718::programmingRunFollowsTheOrder() {
 
     // The input counts span the module's own calibration of the chosen range,
     // for -10..10 V the whole bipolar row.
-    const RegMap map = RegMapFor(Kv718Map);
+    const RegMap map = RegMapFor(Kv718AMap);
     const int rangeRegister = 2 * (s.Inp1RngSet + 7);  // even register of the pair
     const qint32 cl = bench.sim->registerValue(rangeRegister);
     const qint32 ch = bench.sim->registerValue(rangeRegister + 1);
@@ -385,7 +384,7 @@ void TestDrv718::programThenReadGivesTheRecord() {
 void TestDrv718::readWithoutAnOutputRangeWarns() {
     drvbench::Bench bench(Kv718Type, 3);
     QVERIFY(bench.ready());
-    bench.sim->setRegisterValue(RegMapFor(Kv718Map).Out_Rng1, 40);
+    bench.sim->setRegisterValue(RegMapFor(Kv718AMap).Out_Rng1, 40);
     QVERIFY2(bench.read(Kv718Driver(), SettingsSet()), qPrintable(bench.result));
     QCOMPARE(bench.run.warning(), QString("Invalid Output 1 Range"));
     QCOMPARE(bench.run.settings().Out1RngTyp, 40);

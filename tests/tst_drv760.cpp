@@ -56,7 +56,6 @@ void setOptions(SettingsSet& s, int options) {
 }
 
 constexpr int Kv760Type = 9;
-constexpr int Kv760Map = 6;
 
 // A record as the KV760 window would hand it over.
 SettingsSet kv760Record() {

@@ -17,8 +17,6 @@ using namespace kv;
 
 namespace {
 
-constexpr int Kv720Map = 3;
-
 SettingsSet milliVolts(float lo, float hi) {
     SettingsSet s;
     s.Inp1RngTyp = Kv720MilliVolt;

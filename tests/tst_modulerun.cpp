@@ -19,8 +19,6 @@ Q_DECLARE_METATYPE(kv::SettingsSet)
 
 namespace {
 
-constexpr int Kv720Map = 3;
-
 std::vector<Frame> programmingOrder(bool thermocouple) {
     Expect e(Kv720Map);
     e.read("Mod_Type")

@@ -12,17 +12,6 @@
 
 namespace kv {
 
-// Register maps of the families the panel draws.
-enum LiveFamily {
-    Kv714v1Map = 1,
-    Kv716v1Map = 2,
-    Kv720Map = 3,
-    Kv714v2Map = 4,  // also the KV718 "-10"/"-20"
-    Kv716v2Map = 5,
-    Kv760Map = 6,
-    Kv718AMap = 7,
-};
-
 // The records a redraw reads: by default the program-wide ones.
 struct LiveSource {
     const RegMap& add;
