@@ -2,6 +2,8 @@
 // The command line of kv700-cli, read into one request without touching
 // anything else, so that every usage error is found before a port is opened.
 
+#include "serial/frame.h"
+
 #include <QString>
 #include <QStringList>
 
@@ -11,7 +13,7 @@ namespace kv::cli {
 
 enum class Command { Help, Probe, Identify, Read, Program, Regs, Get, Set, SelfTest };
 
-constexpr qint16 DefaultBusId = 16;
+constexpr qint16 DefaultBusId = KvSerialPort::OrdinaryBusId;
 
 struct CliRequest {
     Command command = Command::Help;

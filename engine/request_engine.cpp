@@ -20,7 +20,6 @@ namespace kv {
 
 namespace {
 constexpr qint32 LowestAddress = 16;
-constexpr qint16 LowestBusId = 16;
 constexpr int ReserveWaitMs = 5000;
 
 QString timeOfDay(const char* suffix) {
@@ -139,7 +138,7 @@ void RequestEngine::take(qint32 address, qint16 busId, const QString& tag, qint3
 bool RequestEngine::R_CB(qint32 address, qint16 busId, const QString& tag, qint32 kind,
                          QString& error) {
     QString why = refusal(address);
-    if (why.isEmpty() && busId < LowestBusId)
+    if (why.isEmpty() && busId < KvSerialPort::OrdinaryBusId)
         why = QStringLiteral("ID must be 16 or above");
     if (!why.isEmpty()) {
         refuse(QStringLiteral("R_CB"), why, error);
@@ -156,8 +155,8 @@ bool RequestEngine::PollRead(qint32 address, QString& error) {
         refuse(QStringLiteral("R_CB"), why, error);
         return false;
     }
-    currentMessage_ = KvSerialPort::ReadMessage(LowestBusId, address);
-    take(address, LowestBusId, QStringLiteral("hub"), CallbackHub, StatePollRead);
+    currentMessage_ = KvSerialPort::ReadMessage(KvSerialPort::OrdinaryBusId, address);
+    take(address, KvSerialPort::OrdinaryBusId, QStringLiteral("hub"), CallbackHub, StatePollRead);
     return true;
 }
 
@@ -191,9 +190,9 @@ bool RequestEngine::W_DelayCB(qint32 address, const QVariant& value, qint16 valu
         valueType == ValueLong || valueType == ValueSingle || valueType == ValueLongToo;
     const QByteArray data =
         typed ? dataField(value, {}, {}, {}, valueType) : QByteArray("00000000");
-    delayedWrite_ = KvSerialPort::BuildMessage('W', LowestBusId, address, data);
-    delayedRead_ = KvSerialPort::ReadMessage(LowestBusId, address);
-    take(address, LowestBusId, tag, kind, StateDelayCB);
+    delayedWrite_ = KvSerialPort::BuildMessage('W', KvSerialPort::OrdinaryBusId, address, data);
+    delayedRead_ = KvSerialPort::ReadMessage(KvSerialPort::OrdinaryBusId, address);
+    take(address, KvSerialPort::OrdinaryBusId, tag, kind, StateDelayCB);
     return true;
 }
 

@@ -13,9 +13,10 @@ struct CommandLine {
     QString demoModel;  // empty: the simulator's default module
 };
 
-// `arguments` without the program name. The shell has already removed any
-// quotes, so the first argument that is neither an option nor the word "Debug"
-// names the file. "--demo" may be followed by a model ("--demo KV720-20" or
+// `arguments` without the program name. The shell has usually removed the
+// quotes (a launcher that passes them on is unquoted here), so the first argument that is neither
+// an option nor the word "Debug" names the file. "--demo" may be followed by a model ("--demo
+// KV720-20" or
 // "--demo=KV720-20"); a following argument with a "/" or "." is a file instead.
 CommandLine ParseCommandLine(const QStringList& arguments);
 

@@ -11,7 +11,6 @@
 namespace kv::KvSerialPort {
 
 namespace {
-constexpr qint16 TestBusId = 16;
 constexpr int PrimingBlocks = 10;
 constexpr int MaxReads = 51;
 constexpr int AccumulatorLimit = 800;
@@ -68,7 +67,7 @@ bool judgeAdapter(PortHandle& handle, const QByteArray& frame, QString& text) {
 }  // namespace
 
 QByteArray AdapterTestMessage() {
-    return ReadMessage(TestBusId, RegMapFor(NoModuleMap).Mod_Type);
+    return ReadMessage(OrdinaryBusId, RegMapFor(NoModuleMap).Mod_Type);
 }
 
 AdapterTestOutcome TestAdapter(qint16 port, const QByteArray& message) {

@@ -13,6 +13,8 @@ constexpr char STX = 0x02;
 constexpr char ETX = 0x03;
 constexpr int MessageLength = 12;
 constexpr int FrameLength = 16;
+// Bus ID of ordinary requests and the live polling; multi-part registers count up from it.
+constexpr qint16 OrdinaryBusId = 16;
 
 // The 12-character message: command, bus ID, address, the 8-character data
 // field and the request status "F".
