@@ -3,8 +3,8 @@
 // kv700-sim process (so its work is not counted here).
 //
 //   bench_polling [MINUTES]   (default 10; the simulator binary is found beside this one's tree)
-#include "engine/module_connection.h"
 #include "engine/diagnostics.h"
+#include "engine/module_connection.h"
 
 #include <QCoreApplication>
 #include <QElapsedTimer>
@@ -42,8 +42,9 @@ int main(int argc, char** argv) {
     QTemporaryDir portDir;
     qputenv("KV700_PORT_DIR", portDir.path().toLocal8Bit());
     QProcess sim;
-    sim.start(QStringLiteral(KV700_SIM_PATH), {QStringLiteral("--model"), QStringLiteral("KV720-20"),
-                                               QStringLiteral("--port"), QStringLiteral("1")});
+    sim.start(QStringLiteral(KV700_SIM_PATH),
+              {QStringLiteral("--model"), QStringLiteral("KV720-20"), QStringLiteral("--port"),
+               QStringLiteral("1")});
     if (!sim.waitForStarted()) {
         std::fprintf(stderr, "cannot start %s\n", KV700_SIM_PATH);
         return 1;
@@ -74,7 +75,8 @@ int main(int argc, char** argv) {
         if (rssAfterOne < 0 && clock.elapsed() >= 60000) {
             rssAfterOne = residentKiB();
             std::printf("after 1 min: CPU %.2f %% of one core, RSS %ld KiB\n",
-                        100.0 * (cpuSeconds() - cpuStart) / (clock.elapsed() / 1000.0), rssAfterOne);
+                        100.0 * (cpuSeconds() - cpuStart) / (clock.elapsed() / 1000.0),
+                        rssAfterOne);
             std::fflush(stdout);
         }
         if (clock.elapsed() >= minutes * 60000LL)
@@ -85,9 +87,10 @@ int main(int argc, char** argv) {
 
     const double cpuPercent = 100.0 * (cpuSeconds() - cpuStart) / (clock.elapsed() / 1000.0);
     const long rssEnd = residentKiB();
-    std::printf("after %d min: CPU %.2f %% of one core (target < 2 %%), RSS %ld KiB, growth %ld KiB "
-                "(target < 1024)\n",
-                minutes, cpuPercent, rssEnd, rssEnd - rssAfterOne);
+    std::printf(
+        "after %d min: CPU %.2f %% of one core (target < 2 %%), RSS %ld KiB, growth %ld KiB "
+        "(target < 1024)\n",
+        minutes, cpuPercent, rssEnd, rssEnd - rssAfterOne);
     sim.terminate();
     sim.waitForFinished();
     return 0;

@@ -19,7 +19,8 @@ QString FileNameSafe(const QString& name) {
     static const QString forbidden = QStringLiteral("/\\:*?\"<>|");
     QString safe = name;
     for (QChar& c : safe)
-        if (c.unicode() < 0x20 || c.unicode() == 0x7F || forbidden.contains(c)) c = u'_';
+        if (c.unicode() < 0x20 || c.unicode() == 0x7F || forbidden.contains(c))
+            c = u'_';
     return safe;
 }
 

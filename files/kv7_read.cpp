@@ -51,7 +51,8 @@ bool readBytes(const QString& fileName, QByteArray& bytes, QString& reason) {
 
 // Files from this program are Latin-1; files edited elsewhere are often UTF-8.
 QString decode(QByteArray bytes) {
-    if (bytes.startsWith("\xEF\xBB\xBF")) bytes.remove(0, 3);
+    if (bytes.startsWith("\xEF\xBB\xBF"))
+        bytes.remove(0, 3);
     QStringDecoder utf8(QStringConverter::Utf8);
     const QString text = utf8.decode(bytes);
     return utf8.hasError() ? QString::fromLatin1(bytes) : text;
@@ -79,7 +80,8 @@ bool readItem(const QString& line, qsizetype& pos, Item& item, QString& reason) 
         return true;
     }
     qsizetype comma = line.indexOf(QLatin1Char(','), pos);
-    if (comma < 0) comma = line.size();
+    if (comma < 0)
+        comma = line.size();
     item = {line.mid(pos, comma - pos).trimmed(), false};
     pos = comma;
     return true;
@@ -87,13 +89,15 @@ bool readItem(const QString& line, qsizetype& pos, Item& item, QString& reason) 
 
 bool splitLine(const QString& line, Item& key, Item& value, QString& reason) {
     qsizetype pos = 0;
-    if (!readItem(line, pos, key, reason)) return false;
+    if (!readItem(line, pos, key, reason))
+        return false;
     if (pos >= line.size()) {
         reason = QStringLiteral("%1 has no value").arg(key.text);
         return false;
     }
     ++pos;
-    if (!readItem(line, pos, value, reason)) return false;
+    if (!readItem(line, pos, value, reason))
+        return false;
     if (pos < line.size()) {
         reason = QStringLiteral("%1 has more than one value").arg(key.text);
         return false;
@@ -134,13 +138,15 @@ bool toFloat(const QString& key, const Item& value, float& result, QString& reas
 
 const Kv7Field* findField(const QString& key) {
     for (const Kv7Field& field : Kv7Fields)
-        if (key == QLatin1String(field.key)) return &field;
+        if (key == QLatin1String(field.key))
+            return &field;
     return nullptr;
 }
 
 const Kv7Table* findTable(const QString& key) {
     for (const Kv7Table& table : Kv7Tables)
-        if (key.left(6) == QLatin1String(table.name)) return &table;
+        if (key.left(6) == QLatin1String(table.name))
+            return &table;
     return nullptr;
 }
 
@@ -157,8 +163,10 @@ bool storeField(const Kv7Field& field, const Item& value, SettingsSet& into, qin
     if (const auto* number = std::get_if<FloatField>(&field.member))
         return toFloat(key, value, into.*(*number), reason);
     const IntField member = std::get<IntField>(field.member);
-    if (!toLong(key, value, into.*member, reason)) return false;
-    if (member == &SettingsSet::ModTypeSet) typeCode = into.ModTypeSet;
+    if (!toLong(key, value, into.*member, reason))
+        return false;
+    if (member == &SettingsSet::ModTypeSet)
+        typeCode = into.ModTypeSet;
     return true;
 }
 
@@ -197,10 +205,12 @@ bool loadLine(const QString& line, SettingsSet& into, qint32& typeCode, QString&
         reason = QStringLiteral("too long (more than %1 characters)").arg(MaxLineLength);
         return false;
     }
-    if (line.trimmed().isEmpty()) return true;
+    if (line.trimmed().isEmpty())
+        return true;
     Item key;
     Item value;
-    if (!splitLine(line, key, value, reason)) return false;
+    if (!splitLine(line, key, value, reason))
+        return false;
     if (const Kv7Field* field = findField(key.text))
         return storeField(*field, value, into, typeCode, reason);
     if (const Kv7Table* table = findTable(key.text))

@@ -34,7 +34,8 @@ bool textStorable(const char* key, const QString& text, QString& problem) {
 bool storable(const SettingsSet& record, QString& problem) {
     for (const Kv7Field& field : Kv7Fields) {
         if (const auto* text = std::get_if<TextField>(&field.member)) {
-            if (!textStorable(field.key, record.*(*text), problem)) return false;
+            if (!textStorable(field.key, record.*(*text), problem))
+                return false;
         } else if (const auto* number = std::get_if<FloatField>(&field.member)) {
             if (!std::isfinite(record.*(*number))) {
                 problem = QLatin1String(field.key) + QStringLiteral(" is not a finite number");

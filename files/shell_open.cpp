@@ -28,7 +28,8 @@ constexpr ResultText ShellResults[] = {
 
 QString ShellOpenMessage(int result) {
     for (const ResultText& row : ShellResults)
-        if (row.result == result) return QLatin1String(row.message);
+        if (row.result == result)
+            return QLatin1String(row.message);
     return QStringLiteral("? error:") + QString::number(result);
 }
 

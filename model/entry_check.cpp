@@ -29,7 +29,8 @@ double HighestFull(const RangeDescriptor& range) {
 
 bool CheckNumeric(const QString& text, QString& message, const QString& fieldName) {
     double value = 0;
-    if (ParseDecimal(text, value)) return true;
+    if (ParseDecimal(text, value))
+        return true;
     QString withPoints = text;
     withPoints.replace(QLatin1Char(','), QLatin1Char('.'));
     QString withoutCommas = text;

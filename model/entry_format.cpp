@@ -57,7 +57,8 @@ std::string exactText(double magnitude, std::chars_format format, int precision)
 bool roundAway(std::string& digits, size_t keep) {
     const bool up = keep < digits.size() && digits[keep] >= '5';
     digits.resize(keep);
-    if (!up) return false;
+    if (!up)
+        return false;
     for (size_t i = keep; i-- > 0;) {
         if (digits[i] != '9') {
             ++digits[i];
@@ -79,7 +80,8 @@ QString fixedDigits(double magnitude, int maxDecimals) {
     const std::string exact = exactText(magnitude, std::chars_format::fixed, ExactFixedDecimals);
     size_t whole = exact.find('.');
     std::string digits = exact.substr(0, whole) + exact.substr(whole + 1);
-    if (roundAway(digits, whole + maxDecimals)) ++whole;
+    if (roundAway(digits, whole + maxDecimals))
+        ++whole;
     return withPoint(digits, whole);
 }
 
@@ -125,7 +127,8 @@ constexpr FormatBand DisplayBands[] = {
 
 const char* displayPattern(float value) {
     for (const FormatBand& band : DisplayBands)
-        if (value >= band.low && value <= band.high) return band.pattern;
+        if (value >= band.low && value <= band.high)
+            return band.pattern;
     return value < 0 ? "0.0E-00" : "0.00E+00";
 }
 
@@ -176,13 +179,16 @@ QString RevisionText(const QString& numberText) {
 }
 
 QString VarToText(const QVariant& value) {
-    if (!value.isValid() || value.isNull()) return {};
+    if (!value.isValid() || value.isNull())
+        return {};
     switch (value.typeId()) {
     case QMetaType::Bool:
         return value.toBool() ? QStringLiteral("YES") : QStringLiteral("NO ");
     case QMetaType::Short:
-        if (value.toInt() == 0) return QStringLiteral("NO ");
-        if (value.toInt() == -1) return QStringLiteral("YES");
+        if (value.toInt() == 0)
+            return QStringLiteral("NO ");
+        if (value.toInt() == -1)
+            return QStringLiteral("YES");
         return value.toString();
     case QMetaType::Float:
         return GeneralText(value.toFloat());
@@ -193,7 +199,8 @@ QString VarToText(const QVariant& value) {
     }
     QString text = value.toString();
     const int carriageReturn = text.indexOf(QLatin1Char('\r'));
-    if (carriageReturn >= 0) text.truncate(carriageReturn);
+    if (carriageReturn >= 0)
+        text.truncate(carriageReturn);
     return text.left(70);
 }
 

@@ -15,9 +15,11 @@ QByteArray numberChars(const QString& text) {
     static const QRegularExpression decimal(
         QStringLiteral(R"(^[+-]?(\d+\.?\d*|\.\d+)([eE][+-]?\d+)?$)"));
     const QString trimmed = text.trimmed();
-    if (!decimal.match(trimmed).hasMatch()) return {};
+    if (!decimal.match(trimmed).hasMatch())
+        return {};
     QByteArray chars = trimmed.toLatin1();
-    if (chars.startsWith('+')) chars.remove(0, 1);
+    if (chars.startsWith('+'))
+        chars.remove(0, 1);
     return chars;
 }
 
@@ -29,14 +31,17 @@ bool belowRange(const QByteArray& chars) {
     long long exponent = 0;
     if (exponentAt >= 0) {
         QByteArray digits = chars.mid(exponentAt + 1);
-        if (digits.startsWith('+')) digits.remove(0, 1);
+        if (digits.startsWith('+'))
+            digits.remove(0, 1);
         const auto result =
             std::from_chars(digits.constData(), digits.constData() + digits.size(), exponent);
-        if (result.ec == std::errc::result_out_of_range) return digits.startsWith('-');
+        if (result.ec == std::errc::result_out_of_range)
+            return digits.startsWith('-');
     }
     const int point = mantissa.indexOf('.') >= 0 ? mantissa.indexOf('.') : mantissa.size();
     for (int i = 0; i < mantissa.size(); ++i) {
-        if (mantissa[i] < '1' || mantissa[i] > '9') continue;
+        if (mantissa[i] < '1' || mantissa[i] > '9')
+            continue;
         const long long power = i < point ? point - 1 - i : point - i;
         return power + exponent < 0;
     }
@@ -79,10 +84,12 @@ bool ParseDecimal(const QString& text, float& value) {
 }
 
 bool RoundToLong(double value, qint32& result) {
-    if (!std::isfinite(value)) return false;
+    if (!std::isfinite(value))
+        return false;
     double whole = std::floor(value);
     const double fraction = value - whole;
-    if (fraction > 0.5 || (fraction == 0.5 && std::fmod(whole, 2.0) != 0)) whole += 1;
+    if (fraction > 0.5 || (fraction == 0.5 && std::fmod(whole, 2.0) != 0))
+        whole += 1;
     if (whole < std::numeric_limits<qint32>::min() || whole > std::numeric_limits<qint32>::max())
         return false;
     result = static_cast<qint32>(whole);

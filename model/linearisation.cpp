@@ -52,12 +52,15 @@ bool BuildSensorTable(Table1Data& table, double& inputZero, double& inputFull, d
     Sensor sensor;
     if (!SensorFromText(sensorText, sensor))
         return Fail(message, QStringLiteral("FAIL engineering unit not found"));
-    if (engFull < engZero) return Fail(message, QStringLiteral("FAIL input must be rising"));
+    if (engFull < engZero)
+        return Fail(message, QStringLiteral("FAIL input must be rising"));
 
     double zero = 0.0;
     double full = 0.0;
-    if (!DegEngToDegC(engZero, engUnit, zero, message)) return false;
-    if (!DegEngToDegC(engFull, engUnit, full, message)) return false;
+    if (!DegEngToDegC(engZero, engUnit, zero, message))
+        return false;
+    if (!DegEngToDegC(engFull, engUnit, full, message))
+        return false;
     const double span = full - zero;
     if (span < MinimumSpan - LimitTolerance) {
         double shown = 0.0;
@@ -68,7 +71,8 @@ bool BuildSensorTable(Table1Data& table, double& inputZero, double& inputFull, d
     double minimum = 0.0;
     double maximum = 0.0;
     const double valueZero = SensorValue(sensor, zero, minimum, maximum, message);
-    if (valueZero == SensorFailValue) return false;
+    if (valueZero == SensorFailValue)
+        return false;
     if (zero < minimum - LimitTolerance)
         return LimitFailure(message, sensorText, QStringLiteral(" minimum is:"), minimum, engUnit);
     if (full > maximum + LimitTolerance)
@@ -109,7 +113,8 @@ bool BuildTableC(TableCData& table, double inputZero, double inputFull, const QS
         double minimum = 0.0;
         double maximum = 0.0;
         const double emf = ThermocoupleEmf(t, sensor.type, minimum, maximum, message);
-        if (emf == SensorFailValue) return false;
+        if (emf == SensorFailValue)
+            return false;
         const double point = std::nearbyint(emf / (inputFull - inputZero) * counts * 10.0);
         if (point < previous)
             return Fail(message,

@@ -147,7 +147,8 @@ bool hasLoopPoweredRange(int map) {
 void fillFromRegisters(RangeTable& table, int channel, int map, int firstReg, int lastReg) {
     for (int reg = firstReg; reg <= lastReg; ++reg) {
         const RangeRegister info = GetRangeInfo(reg, map);
-        if (info.channel == channel && !info.oddHalf) table[info.range] = info.descriptor;
+        if (info.channel == channel && !info.oddHalf)
+            table[info.range] = info.descriptor;
     }
 }
 
@@ -155,11 +156,14 @@ void fillFromRegisters(RangeTable& table, int channel, int map, int firstReg, in
 
 RangeRegister GetRangeInfo(int reg, int map) {
     RangeRegister info;
-    if (map < 1 || map > MapCount) return info;
+    if (map < 1 || map > MapCount)
+        return info;
     for (const RangeRow& row : rangeRows) {
-        if (!(row.maps & mapBit(map))) continue;
+        if (!(row.maps & mapBit(map)))
+            continue;
         const bool odd = rangesInPairs(map) && reg == row.reg + 1;
-        if (reg != row.reg && !odd) continue;
+        if (reg != row.reg && !odd)
+            continue;
         info.channel = row.channel;
         info.range = row.range;
         info.oddHalf = odd;

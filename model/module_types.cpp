@@ -56,7 +56,8 @@ const char* const familyNames[] = {
 
 const ModuleType* findType(qint32 typeCode) {
     for (const ModuleType& type : moduleTypes)
-        if (type.code == typeCode) return &type;
+        if (type.code == typeCode)
+            return &type;
     return nullptr;
 }
 
@@ -69,10 +70,13 @@ int GetModMap(qint32 typeCode) {
 
 QString ModelText(qint32 typeCode, qint16 subType) {
     const ModuleType* type = findType(typeCode);
-    if (!type) return QStringLiteral("KV ?");
-    if (!type->bySubType) return QLatin1String(type->text);
+    if (!type)
+        return QStringLiteral("KV ?");
+    if (!type->bySubType)
+        return QLatin1String(type->text);
     for (const SubTypeText& known : subTypeTexts)
-        if (known.code == typeCode && known.subType == subType) return QLatin1String(known.text);
+        if (known.code == typeCode && known.subType == subType)
+            return QLatin1String(known.text);
     return QLatin1String(type->text) + QString::number(subType);
 }
 
@@ -89,7 +93,8 @@ bool CheckModType(qint32 typeCode, int family, QString& message) {
         message = QStringLiteral("CheckModType: ? !");
         return false;
     }
-    if (GetModMap(typeCode) == family) return true;
+    if (GetModMap(typeCode) == family)
+        return true;
     message = ModelText(typeCode, RegVal.TypInput) + QLatin1String(familyNames[family - 1]);
     return false;
 }

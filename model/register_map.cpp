@@ -170,16 +170,19 @@ RegisterRows AllRegisters() {
 
 RegMap RegMapFor(int map) {
     RegMap addresses;
-    if (map < 1 || map > MapCount) return addresses;
+    if (map < 1 || map > MapCount)
+        return addresses;
     for (const RegisterRow& row : AllRegisters())
         row.field.setAddress(addresses, row.addressIn(map));
     return addresses;
 }
 
 const RegisterRow* FindRegister(const RegMap& addresses, int address) {
-    if (address < 0) return nullptr;
+    if (address < 0)
+        return nullptr;
     for (const RegisterRow& row : AllRegisters())
-        if (row.isRegister() && row.field.address(addresses) == address) return &row;
+        if (row.isRegister() && row.field.address(addresses) == address)
+            return &row;
     return nullptr;
 }
 
@@ -192,7 +195,8 @@ void SetRegMap(RegMap& addresses, int map) {
         RegVal = notDefined;
         return;
     }
-    if (map < 1 || map > MapCount) return;
+    if (map < 1 || map > MapCount)
+        return;
     for (const RegisterRow& row : AllRegisters())
         row.field.setAddress(addresses, row.addressIn(map));
 }

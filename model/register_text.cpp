@@ -45,7 +45,8 @@ QString describe(const RegisterRow& row, int id) {
 
 const RegisterRow* rowAt(int address, bool (*wanted)(const RegisterRow&)) {
     for (const RegisterRow& row : AllRegisters())
-        if (wanted(row) && row.field.address(RegAdd) == address) return &row;
+        if (wanted(row) && row.field.address(RegAdd) == address)
+            return &row;
     return nullptr;
 }
 
@@ -67,10 +68,14 @@ QString valueText(const RegisterRow& row) {
 }  // namespace
 
 QString GetRegDescription(int address, int id) {
-    if (address == -1) return QStringLiteral("Address Not Defined");
-    if (const RegisterRow* row = rowAt(address, namedBeforeRanges)) return describe(*row, id);
-    if (insideRangeSpan(address)) return GetRangeDescription(address);
-    if (const RegisterRow* row = rowAt(address, namedAfterRanges)) return describe(*row, id);
+    if (address == -1)
+        return QStringLiteral("Address Not Defined");
+    if (const RegisterRow* row = rowAt(address, namedBeforeRanges))
+        return describe(*row, id);
+    if (insideRangeSpan(address))
+        return GetRangeDescription(address);
+    if (const RegisterRow* row = rowAt(address, namedAfterRanges))
+        return describe(*row, id);
     logAddress("GetRegDescription", address);
     return QStringLiteral("Address") + QString::number(address);
 }
@@ -82,7 +87,8 @@ QString GetRangeDescription(int address) {
         return unknown;
     }
     const RangeRegister info = GetRangeInfo(address, ModuleMap);
-    if (info.channel == 0) return unknown;
+    if (info.channel == 0)
+        return unknown;
     return ChannelPrefix(info.channel) + ProgramRangeTable(info.channel)[info.range].description;
 }
 

@@ -28,7 +28,8 @@ QByteArray part(const QByteArray& data, int index, int digits) {
 }
 
 bool decode16(int address, const QByteArray& data, qint16& value) {
-    if (WireToInt(data, value)) return true;
+    if (WireToInt(data, value))
+        return true;
     logFailure(
         QStringLiteral("Overflow Address %1 Data %2").arg(address).arg(QString::fromLatin1(data)));
     return false;
@@ -46,7 +47,8 @@ bool storeValue(const RegisterRow& row, int address, const QByteArray& data) {
         break;
     }
     qint16 value = 0;
-    if (!decode16(address, data, value)) return true;
+    if (!decode16(address, data, value))
+        return true;
     row.field.storeInt(RegVal, value);
     if (row.field.is(&RegMap::TypInput) && captionHandler)
         captionHandler(ModelText(RegVal.Mod_Type, RegVal.TypInput) + QLatin1Char(' '));
@@ -55,7 +57,8 @@ bool storeValue(const RegisterRow& row, int address, const QByteArray& data) {
 
 bool storeReading(const RegisterRow& row, int address, const QByteArray& data) {
     qint16 value = 0;
-    if (!decode16(address, data, value)) return true;
+    if (!decode16(address, data, value))
+        return true;
     row.field.storeLong(RegVal, value);
     return false;
 }
@@ -99,7 +102,8 @@ void storeErrorBytes(int id, const QByteArray& data) {
 }  // namespace
 
 bool UpdateRegValue(int address, const QByteArray& data, int id, int status) {
-    if (status != 0) return true;
+    if (status != 0)
+        return true;
     if (data.size() != DataLength) {
         logFailure(QStringLiteral("Data length Address %1 Data %2")
                        .arg(address)

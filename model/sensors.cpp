@@ -63,7 +63,8 @@ double ThermocoupleEmf(double celsius, QChar type, double& minimum, double& maxi
     }
     minimum = data->minimum;
     maximum = data->maximum;
-    if (celsius < data->linearBelow) return celsius * TypeBLinearSlope;
+    if (celsius < data->linearBelow)
+        return celsius * TypeBLinearSlope;
     return Evaluate(PieceFor(*data, celsius), celsius);
 }
 
@@ -73,7 +74,8 @@ double RtdResistance(double celsius, int nominal, double& minimum, double& maxim
     const double r0 = nominal == 1000 ? 1000.0 : 100.0;
     const double t = celsius;
     double ratio = 1.0 + RtdA * t + RtdB * t * t;
-    if (t < 0.0) ratio += RtdC * (t - 100.0) * t * t * t;
+    if (t < 0.0)
+        ratio += RtdC * (t - 100.0) * t * t * t;
     return r0 * ratio;
 }
 

@@ -25,12 +25,14 @@ QVector<TableStep> TableTransferSteps(const qint32* points, int lastUsed) {
 
 int TableStepIndex(int busId, int lastUsed) {
     const int k = busId - FirstTableBusId;
-    if (k < 0 || k > lastUsed || k % PointsPerStep != 0) return -1;
+    if (k < 0 || k > lastUsed || k % PointsPerStep != 0)
+        return -1;
     return k / PointsPerStep;
 }
 
 bool CheckTableReturnId(int sentId, int returnedId, bool writing, QString& message) {
-    if (sentId == returnedId) return true;
+    if (sentId == returnedId)
+        return true;
     if (writing)
         message = QStringLiteral("? table Send_ID:") + QString::number(sentId) +
                   QStringLiteral(" Return_ID:") + QString::number(returnedId);
@@ -42,7 +44,8 @@ bool CheckTableReturnId(int sentId, int returnedId, bool writing, QString& messa
 
 bool CheckTableReadBack(const qint32* points, int lastUsed, QString& message) {
     const qint32 received = points[lastUsed + 1];
-    if ((quint32(received) & PointMask) == quint32(TableChecksumOf(points, lastUsed))) return true;
+    if ((quint32(received) & PointMask) == quint32(TableChecksumOf(points, lastUsed)))
+        return true;
     message = QStringLiteral("Table Check Sum Fail  ") + QString::number(points[lastUsed]) +
               QLatin1Char(',') + QString::number(received);
     return false;

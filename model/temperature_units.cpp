@@ -22,7 +22,8 @@ const TemperatureUnit Units[] = {
 
 const TemperatureUnit* FindUnit(const QString& unit) {
     const QString trimmed = unit.trimmed();
-    if (trimmed.isEmpty()) return nullptr;
+    if (trimmed.isEmpty())
+        return nullptr;
     const QChar last = trimmed.back();
     const auto* end = std::end(Units);
     const auto* found = std::find_if(std::begin(Units), end, [last](const TemperatureUnit& u) {
@@ -34,7 +35,8 @@ const TemperatureUnit* FindUnit(const QString& unit) {
 }  // namespace
 
 bool DegC_ToDegEng(double& value, const QString& unit, double celsius, QString& message) {
-    if (!DegC_SpanToDegEng(value, unit, celsius, message)) return false;
+    if (!DegC_SpanToDegEng(value, unit, celsius, message))
+        return false;
     value += FindUnit(unit)->offset;
     return true;
 }

@@ -9,7 +9,8 @@ using namespace kv;
 namespace {
 const RegisterRow& rowNamed(const char* name) {
     for (const RegisterRow& row : AllRegisters())
-        if (qstrcmp(row.field.name(), name) == 0) return row;
+        if (qstrcmp(row.field.name(), name) == 0)
+            return row;
     qFatal("no row %s", name);
 }
 }  // namespace
@@ -159,7 +160,8 @@ void TestRegMap::registersUniquePerMap() {
         QHash<int, QString> owner;
         for (const RegisterRow& row : AllRegisters()) {
             const int address = row.addressIn(map);
-            if (!row.isRegister() || address < 0) continue;
+            if (!row.isRegister() || address < 0)
+                continue;
             QVERIFY2(!owner.contains(address),
                      qPrintable(QStringLiteral("map %1 address %2: %3 and %4")
                                     .arg(map)
