@@ -17,10 +17,6 @@ constexpr int AccumulatorLimit = 800;
 constexpr qint64 DecayMaxMs = 200;
 constexpr qint64 DecayMinMs = 40;
 
-QString millis(qint64 ms, const char* pattern) {
-    return QStringLiteral("%1%2").arg(ms, 3, 10, QLatin1Char('0')).arg(QLatin1String(pattern));
-}
-
 // Runs the exchange on an open port; returns the outcome text without its prefix.
 bool judgeAdapter(PortHandle& handle, const QByteArray& frame, QString& text) {
     if (!SendPriming(handle, PrimingBlocks, text))
@@ -41,21 +37,21 @@ bool judgeAdapter(PortHandle& handle, const QByteArray& frame, QString& text) {
             return false;
         received.append(buffer, qMin<qsizetype>(count, AccumulatorLimit - received.size()));
         const qint64 elapsed = clock.elapsed();
-        DebugMessage(DiagSerialStep, QStringLiteral("COM"), millis(elapsed, " +"), received,
-                     QStringLiteral("Sc"));
+        DebugMessage(DiagSerialStep, QStringLiteral("COM"), MillisecondsText(elapsed, " +"),
+                     received, QStringLiteral("Sc"));
         if (count > 0)
             continue;
         if (elapsed > DecayMaxMs) {
-            text = QStringLiteral("decay") + millis(elapsed, " > 200mS ");
+            text = QStringLiteral("decay") + MillisecondsText(elapsed, " > 200mS ");
             return false;
         }
         if (elapsed < DecayMinMs) {
-            text = QStringLiteral("decay") + millis(elapsed, " < 40mS ");
+            text = QStringLiteral("decay") + MillisecondsText(elapsed, " < 40mS ");
             return false;
         }
         QByteArray reply;
         if (ScanReply(received, frame, reply, false)) {
-            text = millis(elapsed, " mS ");
+            text = MillisecondsText(elapsed, " mS ");
             return true;
         }
         text = QStringLiteral("Reply not found ?");

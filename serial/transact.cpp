@@ -11,12 +11,6 @@ namespace kv::KvSerialPort {
 namespace {
 const QString comTag = QStringLiteral("COM");
 
-QString elapsedText(const QElapsedTimer& clock, const char* pattern) {
-    return QStringLiteral("%1%2")
-        .arg(clock.elapsed(), 3, 10, QLatin1Char('0'))
-        .arg(QLatin1String(pattern));
-}
-
 void logStep(const QString& text, const QByteArray& data) {
     DebugMessage(DiagSerialStep, comTag, text, data, QStringLiteral("Sc"));
 }
@@ -111,18 +105,22 @@ bool Transact(qint16 port, const QByteArray& message, qint16 connector, bool deb
             return false;
         accumulator.append(buffer, count);
         if (debug)
-            logStep(elapsedText(clock, " +"), accumulator);
+            logStep(MillisecondsText(clock.elapsed(), " +"), accumulator);
         if (ScanReply(accumulator, frame, reply, debug))
             return true;
         if (debug)
-            logStep(elapsedText(clock, " F"), {});
+            logStep(MillisecondsText(clock.elapsed(), " F"), {});
         if (cycle == TableReadBudget) {
-            logStep(elapsedText(clock, " Write Table Time Out"), {});
+            logStep(MillisecondsText(clock.elapsed(), " Write Table Time Out"), {});
             reply = message;
             return true;
         }
     }
     return false;
+}
+
+QString MillisecondsText(qint64 ms, const char* pattern) {
+    return QStringLiteral("%1%2").arg(ms, 3, 10, QLatin1Char('0')).arg(QLatin1String(pattern));
 }
 
 }  // namespace kv::KvSerialPort

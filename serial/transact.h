@@ -31,5 +31,7 @@ bool SendFrame(PortHandle& handle, const QByteArray& frame, QString& error);
 bool SendPriming(PortHandle& handle, int blocks, QString& error);
 // Reads up to one frame's length into `buffer`; `count` may be 0.
 bool ReceiveBlock(PortHandle& handle, char* buffer, int& count, QString& error);
+// Milliseconds with at least three digits followed by `pattern`: "026 +".
+QString MillisecondsText(qint64 ms, const char* pattern);
 
 }  // namespace kv::KvSerialPort
