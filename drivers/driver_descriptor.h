@@ -31,34 +31,9 @@ struct DriverWork {
     int DrvStep = -1;  // row of the order taken last, for progress reports
 };
 
-// A member of RegMap by name. Its address is looked up in RegAdd when a step
-// runs, so no step ever holds a literal address.
-class RegisterRef {
-public:
-    constexpr RegisterRef() = default;
-    constexpr RegisterRef(const char* name, qint32 RegMap::*member) : name_(name), long_(member) {}
-    constexpr RegisterRef(const char* name, qint16 RegMap::*member) : name_(name), int_(member) {}
-    constexpr RegisterRef(const char* name, float RegMap::*member) : name_(name), single_(member) {}
-
-    const char* name() const { return name_; }
-    bool isSet() const { return long_ || int_ || single_; }
-    bool isSingle() const { return single_ != nullptr; }
-    bool isSameAs(const RegisterRef& other) const {
-        return long_ == other.long_ && int_ == other.int_ && single_ == other.single_;
-    }
-    // -1 when unset or not defined in the map.
-    int address(const RegMap& addresses) const;
-    // The member's value in a value record (RegVal).
-    double value(const RegMap& values) const;
-
-private:
-    const char* name_ = "";
-    qint32 RegMap::*long_ = nullptr;
-    qint16 RegMap::*int_ = nullptr;
-    float RegMap::*single_ = nullptr;
-};
-
-#define KV_REG(member) ::kv::RegisterRef(#member, &::kv::RegMap::member)
+// A register of a step row, by member; its address is looked up in RegAdd when the
+// step runs, so no step ever holds a literal address.
+#define KV_REG(member) ::kv::RegField(#member, &::kv::RegMap::member)
 
 // Where the value of a write comes from.
 struct ValueSource {
@@ -76,7 +51,7 @@ struct ValueSource {
     float SettingsSet::*settingSingle = nullptr;
     qint16 DriverWork::*workInt = nullptr;
     qint32 DriverWork::*workLong = nullptr;
-    RegisterRef computed;
+    RegField computed;
     QString SettingsSet::*text = nullptr;
     int index = 0;
 };
@@ -105,7 +80,7 @@ constexpr ValueSource Work(qint32 DriverWork::*field) {
     v.workLong = field;
     return v;
 }
-constexpr ValueSource Computed(RegisterRef member) {
+constexpr ValueSource Computed(RegField member) {
     ValueSource v;
     v.kind = ValueSource::Computed;
     v.computed = member;
@@ -144,18 +119,18 @@ enum class AckKind : quint8 {
 };
 
 struct Acknowledgement {
-    RegisterRef reg;
+    RegField reg;
     AckKind kind = AckKind::Register;
     StepCondition when = nullptr;  // nullptr: always
 };
 
-constexpr Acknowledgement On(RegisterRef reg, StepCondition when = nullptr) {
+constexpr Acknowledgement On(RegField reg, StepCondition when = nullptr) {
     return {reg, AckKind::Register, when};
 }
-constexpr Acknowledgement OnFileNameParts(RegisterRef reg) {
+constexpr Acknowledgement OnFileNameParts(RegField reg) {
     return {reg, AckKind::FileNameParts, nullptr};
 }
-constexpr Acknowledgement OnTableParts(RegisterRef reg) {
+constexpr Acknowledgement OnTableParts(RegField reg) {
     return {reg, AckKind::TableParts, nullptr};
 }
 
@@ -170,23 +145,23 @@ enum class RequestKind : quint8 {
 
 struct NextRequest {
     RequestKind kind = RequestKind::Read;
-    RegisterRef reg;
+    RegField reg;
     ValueSource value;
 };
 
-constexpr NextRequest Write(RegisterRef reg, ValueSource value) {
+constexpr NextRequest Write(RegField reg, ValueSource value) {
     return {RequestKind::Write, reg, value};
 }
-constexpr NextRequest WriteData(RegisterRef reg, ValueSource value) {
+constexpr NextRequest WriteData(RegField reg, ValueSource value) {
     return {RequestKind::WriteData, reg, value};
 }
-constexpr NextRequest Read(RegisterRef reg) {
+constexpr NextRequest Read(RegField reg) {
     return {RequestKind::Read, reg, {}};
 }
-constexpr NextRequest FirstFileNamePart(RegisterRef reg) {
+constexpr NextRequest FirstFileNamePart(RegField reg) {
     return {RequestKind::FirstFileName, reg, {}};
 }
-constexpr NextRequest FirstTablePart(RegisterRef reg) {
+constexpr NextRequest FirstTablePart(RegField reg) {
     return {RequestKind::FirstTable, reg, {}};
 }
 
@@ -222,15 +197,15 @@ struct RunTexts {
 };
 
 struct DriverDescriptor {
-    const char* module;          // "modKV720"
-    const char* dispatcher;      // "GS720"
-    int family;                  // register map the driver serves; CheckModType asks for it
-    const char* setTag;          // log tag of a failed programming step
-    const char* getTag;          // log tag of a failed reading step
-    StepTable programOrder;      // first row: acknowledgement of Mod_Type
-    StepTable readOrder;         // first row: acknowledgement of Mod_Type
-    RegisterRef lastProgrammed;  // handled by the run, never by a step
-    RegisterRef lastRead;
+    const char* module;       // "modKV720"
+    const char* dispatcher;   // "GS720"
+    int family;               // register map the driver serves; CheckModType asks for it
+    const char* setTag;       // log tag of a failed programming step
+    const char* getTag;       // log tag of a failed reading step
+    StepTable programOrder;   // first row: acknowledgement of Mod_Type
+    StepTable readOrder;      // first row: acknowledgement of Mod_Type
+    RegField lastProgrammed;  // handled by the run, never by a step
+    RegField lastRead;
     DriverWork* work;
     RunTexts run;
 };

@@ -52,8 +52,8 @@ struct AuxBand {
     bool high;
     double start;
     double span;
-    RegisterRef zero;
-    RegisterRef full;
+    RegField zero;
+    RegField full;
 };
 
 const AuxBand auxBands[] = {

@@ -124,7 +124,7 @@ void ModuleRun::step(qint32 address, qint16 busId) {
         return;
     }
     RequestEngine& engine = connection_.engine();
-    const RegisterRef& last = programming ? driver->lastProgrammed : driver->lastRead;
+    const RegField& last = programming ? driver->lastProgrammed : driver->lastRead;
     if (address == last.address(RegAdd)) {
         // Before anything is reported done, make sure the module that answered
         // the last step is the one the run started on.

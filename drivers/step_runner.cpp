@@ -23,7 +23,7 @@ struct TableData {
     const qint32* read;     // the parts received into RegVal
 };
 
-bool tableOf(const RegisterRef& reg, const SettingsSet& settings, TableData& table, QString& text) {
+bool tableOf(const RegField& reg, const SettingsSet& settings, TableData& table, QString& text) {
     if (reg.isSameAs(KV_REG(Table1))) {
         table = {Table1LastUsed, settings.Table1.data(), RegVal.Table1_Pts.data()};
         return true;
@@ -73,12 +73,12 @@ void valueOf(const StepContext& step, const ValueSource& source, QVariant& value
     value = 0;
 }
 
-bool readPart(StepContext& step, const RegisterRef& reg, QString& text) {
+bool readPart(StepContext& step, const RegField& reg, QString& text) {
     return step.engine.R_CB(reg.address(RegAdd), step.work.DrvBusID, step.work.DrvRequester,
                             CallbackGet, text);
 }
 
-bool sendFileNamePart(StepContext& step, const RegisterRef& reg, QString& text) {
+bool sendFileNamePart(StepContext& step, const RegField& reg, QString& text) {
     if (step.reading)
         return readPart(step, reg, text);
     const QString name =
@@ -89,7 +89,7 @@ bool sendFileNamePart(StepContext& step, const RegisterRef& reg, QString& text) 
                                 ValueFourChars, QString(), text);
 }
 
-bool sendTablePart(StepContext& step, const RegisterRef& reg, QString& text) {
+bool sendTablePart(StepContext& step, const RegField& reg, QString& text) {
     if (step.reading)
         return readPart(step, reg, text);
     TableData table{};
@@ -130,7 +130,7 @@ bool queue(StepContext& step, const NextRequest& next, QString& text) {
 
 // One acknowledged part of the file name. `done` after the last part, with the
 // name taken over when reading.
-bool fileNamePart(StepContext& step, const RegisterRef& reg, bool& done, QString& text) {
+bool fileNamePart(StepContext& step, const RegField& reg, bool& done, QString& text) {
     const bool expected = step.busId == step.work.DrvBusID && step.busId >= FileNameIds.first &&
                           step.busId <= FileNameIds.last &&
                           (step.busId - FileNameIds.first) % FileNameIds.step == 0;
@@ -158,7 +158,7 @@ bool fileNamePart(StepContext& step, const RegisterRef& reg, bool& done, QString
 
 // One acknowledged part of a table transfer. `done` after the last part; a
 // table read back with a wrong checksum is reported in the warning text.
-bool tablePart(StepContext& step, const RegisterRef& reg, bool& done, QString& text) {
+bool tablePart(StepContext& step, const RegField& reg, bool& done, QString& text) {
     TableData table{};
     if (!tableOf(reg, step.settings, table, text))
         return false;

@@ -9,6 +9,8 @@ RegMap RegVal;
 int ModuleMap = NoModuleMap;
 
 double RegField::value(const RegMap& record) const {
+    if (!isSet())
+        return 0.0;
     switch (width_) {
     case RegWidth::Long:
         return record.*longMember_;
@@ -21,6 +23,8 @@ double RegField::value(const RegMap& record) const {
 }
 
 int RegField::address(const RegMap& addresses) const {
+    if (!isSet())
+        return -1;
     return width_ == RegWidth::Single ? qRound(addresses.*singleMember_) : int(value(addresses));
 }
 
@@ -40,9 +44,10 @@ void RegField::setAddress(RegMap& addresses, int address) const {
 
 namespace {
 
-#define L(member) RegField::Long(#member, &RegMap::member)
-#define I(member) RegField::Int(#member, &RegMap::member)
-#define S(member) RegField::Single(#member, &RegMap::member)
+// The width letter is checked: a member of another width does not compile.
+#define L(member) RegField(#member, static_cast<qint32 RegMap::*>(&RegMap::member))
+#define I(member) RegField(#member, static_cast<qint16 RegMap::*>(&RegMap::member))
+#define S(member) RegField(#member, static_cast<float RegMap::*>(&RegMap::member))
 
 constexpr qint16 na = -1;
 

@@ -133,27 +133,32 @@ enum ModuleMapNumber {
 enum class RegWidth : quint8 { Long, Int, Single };
 
 // One member of RegMap, by name and width. An S member holds its address as a
-// floating number; address() rounds it.
+// floating number; address() rounds it. A default-built field names no member
+// (an optional register in a driver's step row).
 class RegField {
 public:
-    static constexpr RegField Long(const char* name, qint32 RegMap::*member) {
-        return RegField(name, RegWidth::Long, member, nullptr, nullptr);
-    }
-    static constexpr RegField Int(const char* name, qint16 RegMap::*member) {
-        return RegField(name, RegWidth::Int, nullptr, member, nullptr);
-    }
-    static constexpr RegField Single(const char* name, float RegMap::*member) {
-        return RegField(name, RegWidth::Single, nullptr, nullptr, member);
-    }
-
+    constexpr RegField() = default;
+    constexpr RegField(const char* name, qint32 RegMap::*member)
+        : RegField(name, RegWidth::Long, member, nullptr, nullptr) {}
+    constexpr RegField(const char* name, qint16 RegMap::*member)
+        : RegField(name, RegWidth::Int, nullptr, member, nullptr) {}
+    constexpr RegField(const char* name, float RegMap::*member)
+        : RegField(name, RegWidth::Single, nullptr, nullptr, member) {}
     constexpr const char* name() const { return name_; }
     constexpr RegWidth width() const { return width_; }
     constexpr bool is(qint32 RegMap::*member) const { return longMember_ == member; }
     constexpr bool is(qint16 RegMap::*member) const { return intMember_ == member; }
     constexpr bool is(float RegMap::*member) const { return singleMember_ == member; }
+    constexpr bool isSet() const { return longMember_ || intMember_ || singleMember_; }
+    constexpr bool isSingle() const { return singleMember_ != nullptr; }
+    constexpr bool isSameAs(const RegField& other) const {
+        return longMember_ == other.longMember_ && intMember_ == other.intMember_ &&
+               singleMember_ == other.singleMember_;
+    }
 
-    // The member's value, exact for every width.
+    // The member's value, exact for every width; 0 for no member.
     double value(const RegMap& record) const;
+    // -1 for no member, or for one the map does not define.
     int address(const RegMap& addresses) const;
     void setAddress(RegMap& addresses, int address) const;
 
@@ -166,11 +171,11 @@ private:
                        float RegMap::*s)
         : name_(name), width_(width), longMember_(l), intMember_(i), singleMember_(s) {}
 
-    const char* name_;
-    RegWidth width_;
-    qint32 RegMap::*longMember_;
-    qint16 RegMap::*intMember_;
-    float RegMap::*singleMember_;
+    const char* name_ = "";
+    RegWidth width_ = RegWidth::Long;
+    qint32 RegMap::*longMember_ = nullptr;
+    qint16 RegMap::*intMember_ = nullptr;
+    float RegMap::*singleMember_ = nullptr;
 };
 
 // How a row takes part in lookups by address.

@@ -48,9 +48,10 @@ struct FactoryRow {
     std::array<double, MapCount> value;  // per family 1..7; na leaves the register 0
 };
 
-#define L(member) RegField::Long(#member, &RegMap::member)
-#define I(member) RegField::Int(#member, &RegMap::member)
-#define S(member) RegField::Single(#member, &RegMap::member)
+// The width letter is checked: a member of another width does not compile.
+#define L(member) RegField(#member, static_cast<qint32 RegMap::*>(&RegMap::member))
+#define I(member) RegField(#member, static_cast<qint16 RegMap::*>(&RegMap::member))
+#define S(member) RegField(#member, static_cast<float RegMap::*>(&RegMap::member))
 
 // User calibration spanning the whole of the selected ranges.
 const ScaledRow userCountRows[] = {
@@ -187,10 +188,10 @@ FactoryImage FactoryState(const ModuleIdentity& identity) {
         for (const FactoryRow& row : factoryRows)
             put(image, map, row.field, row.value[family - 1]);
     }
-    put(image, map, RegField::Long("Serial_No", &RegMap::Serial_No), identity.serial);
-    put(image, map, RegField::Long("Revision", &RegMap::Revision), identity.revision);
-    put(image, map, RegField::Long("Buss_ID", &RegMap::Buss_ID), identity.busId);
-    put(image, map, RegField::Int("TypInput", &RegMap::TypInput), identity.subType);
+    put(image, map, RegField("Serial_No", &RegMap::Serial_No), identity.serial);
+    put(image, map, RegField("Revision", &RegMap::Revision), identity.revision);
+    put(image, map, RegField("Buss_ID", &RegMap::Buss_ID), identity.busId);
+    put(image, map, RegField("TypInput", &RegMap::TypInput), identity.subType);
 
     image.fileName = QByteArray("FACTORY SETTINGS").leftJustified(FileNameLength, ' ');
     image.table1 = linearTable(Table1Points, Table1Points - 2, 100);

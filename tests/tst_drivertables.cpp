@@ -25,7 +25,7 @@ struct Order {
     const DriverDescriptor* driver;
     const char* which;
     StepTable rows;
-    RegisterRef last;
+    RegField last;
 };
 
 QList<Order> allOrders() {
@@ -44,13 +44,13 @@ QByteArray where(const Order& order, int row = -1) {
     return text;
 }
 
-bool isRegisterOf(const RegisterRef& reg, int family) {
+bool isRegisterOf(const RegField& reg, int family) {
     const RegMap map = RegMapFor(family);
     const int address = reg.address(map);
     return reg.isSet() && address >= 0 && FindRegister(map, address) != nullptr;
 }
 
-bool acknowledgedBy(const StepTable& rows, const RegisterRef& reg, AckKind kind) {
+bool acknowledgedBy(const StepTable& rows, const RegField& reg, AckKind kind) {
     for (const StepRow& row : rows)
         if (row.ack.reg.isSameAs(reg) && row.ack.kind == kind)
             return true;
